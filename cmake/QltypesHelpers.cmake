@@ -1,0 +1,50 @@
+# Functions that every folder's CMakeLists.txt uses.
+
+# Settings that are ours alone and never reach a user's build.
+function(qltypes_private_settings target)
+  target_compile_features(${target} PUBLIC cxx_std_20)
+  set_target_properties(${target} PROPERTIES CXX_EXTENSIONS OFF)
+  if(QLTYPES_WARNINGS)
+    target_compile_options(${target} PRIVATE -Wall -Wextra -Wpedantic -Wshadow -Werror)
+  endif()
+endfunction()
+
+# A shared (or static) library of the product: hidden visibility, versioned soname.
+function(qltypes_library_settings target)
+  qltypes_private_settings(${target})
+  set_target_properties(
+    ${target}
+    PROPERTIES CXX_VISIBILITY_PRESET hidden
+               VISIBILITY_INLINES_HIDDEN ON
+               POSITION_INDEPENDENT_CODE ON
+               VERSION ${PROJECT_VERSION}
+               SOVERSION ${PROJECT_VERSION_MAJOR})
+  target_include_directories(
+    ${target} PUBLIC $<BUILD_INTERFACE:${qltypes_SOURCE_DIR}>
+                     $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
+endfunction()
+
+# One test executable a folder: qltypes_add_test(types DataType_test.cpp ...).
+# LIBRARIES adds what the folder needs beyond the two libraries and GoogleTest.
+# White-box tests of hidden symbols compile the sources they need into the test with WHITE_BOX.
+function(qltypes_add_test name)
+  cmake_parse_arguments(arg "" "" "LIBRARIES;WHITE_BOX" ${ARGN})
+  list(TRANSFORM arg_WHITE_BOX PREPEND "${qltypes_SOURCE_DIR}/")
+  add_executable(test_${name} ${arg_UNPARSED_ARGUMENTS} ${arg_WHITE_BOX})
+  qltypes_private_settings(test_${name})
+  target_include_directories(test_${name} PRIVATE "${qltypes_SOURCE_DIR}")
+  target_compile_definitions(test_${name} PRIVATE QLTYPES_TEST_DATA_DIR="${qltypes_SOURCE_DIR}/tests/data")
+  target_link_libraries(test_${name} PRIVATE qltypes::qltypes qltypes::platform ${arg_LIBRARIES} testsupport)
+  add_test(NAME unit.${name} COMMAND test_${name})
+endfunction()
+
+# One benchmark program a topic: qltypes_add_bench(types lookup_bench.cpp LIBRARIES ...).
+# The program is bench/<folder>/<topic>_bench in the build tree.
+function(qltypes_add_bench folder source)
+  cmake_parse_arguments(arg "" "" "LIBRARIES" ${ARGN})
+  get_filename_component(topic ${source} NAME_WE)
+  add_executable(${topic} ${source})
+  qltypes_private_settings(${topic})
+  target_include_directories(${topic} PRIVATE "${qltypes_SOURCE_DIR}")
+  target_link_libraries(${topic} PRIVATE qltypes::qltypes qltypes::platform ${arg_LIBRARIES} benchmark::benchmark)
+endfunction()

@@ -1,0 +1,12 @@
+// Host arrays: reference-counted values of the host language.
+#pragma once
+
+#include "qlplatform/Export.h"
+
+struct txArray_tag;
+
+/// Gives up one reference; the array goes with its last one. Null is allowed.
+QL_EXPORT void txDestroyArray(txArray_tag* array);
+
+/// Takes one more reference and marks the array as no longer temporary, so that it outlives the present call.
+QL_EXPORT void txKeepArray(txArray_tag* array);

@@ -1,0 +1,1 @@
+#include "qltypes/fixed_point/FixPointDefs.h"
