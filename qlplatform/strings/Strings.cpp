@@ -44,6 +44,7 @@ template <class To, class From> std::basic_string<To> converted(std::basic_strin
 } // namespace
 
 std::size_t utStrlen(const char* text) { return text ? std::strlen(text) : 0; }
+bool utIsEmptyString(const char* text) { return utStrlen(text) == 0; }
 
 int qlsvStrcmp(const std::u16string& a, const std::u16string& b) { return a.compare(b); }
 

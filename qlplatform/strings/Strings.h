@@ -10,6 +10,9 @@
 /// Length of a NUL-terminated text in bytes; 0 for null.
 QL_EXPORT std::size_t utStrlen(const char* text);
 
+/// Whether a NUL-terminated text is null or has no characters.
+QL_EXPORT bool utIsEmptyString(const char* text);
+
 /// Compares two wide texts by code unit: below 0, 0 or above 0.
 QL_EXPORT int qlsvStrcmp(const std::u16string& a, const std::u16string& b);
 
