@@ -9,7 +9,15 @@ function(qltypes_private_settings target)
   endif()
 endfunction()
 
-# A shared (or static) library of the product: hidden visibility, versioned soname.
+# The headers that clients may include, relative to the source tree.
+function(qltypes_public_headers result)
+  file(GLOB_RECURSE headers CONFIGURE_DEPENDS RELATIVE "${qltypes_SOURCE_DIR}" "${qltypes_SOURCE_DIR}/qlplatform/*.h"
+       "${qltypes_SOURCE_DIR}/qltypes/*.h")
+  list(FILTER headers EXCLUDE REGEX "_internal\\.h$")
+  set(${result} "${headers}" PARENT_SCOPE)
+endfunction()
+
+# A shared (or static) library of the product: hidden visibility, versioned soname, found beside its sibling.
 function(qltypes_library_settings target)
   qltypes_private_settings(${target})
   set_target_properties(
@@ -18,10 +26,17 @@ function(qltypes_library_settings target)
                VISIBILITY_INLINES_HIDDEN ON
                POSITION_INDEPENDENT_CODE ON
                VERSION ${PROJECT_VERSION}
-               SOVERSION ${PROJECT_VERSION_MAJOR})
+               SOVERSION ${PROJECT_VERSION_MAJOR}
+               INSTALL_RPATH "$ORIGIN")
   target_include_directories(
     ${target} PUBLIC $<BUILD_INTERFACE:${qltypes_SOURCE_DIR}>
                      $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
+  get_target_property(type ${target} TYPE)
+  if(type STREQUAL "SHARED_LIBRARY")
+    set(map "${qltypes_SOURCE_DIR}/cmake/hidden.map")
+    target_link_options(${target} PRIVATE "LINKER:--version-script=${map}")
+    set_property(TARGET ${target} APPEND PROPERTY LINK_DEPENDS "${map}")
+  endif()
 endfunction()
 
 # One test executable a folder: qltypes_add_test(types DataType_test.cpp ...).

@@ -1,0 +1,56 @@
+# What `cmake --install` puts where: headers, both libraries, the inspector, the CMake package and the pkg-config files.
+# Always on, also below a parent project, whose own exported targets may depend on these.
+
+include(CMakePackageConfigHelpers)
+
+set(packageDir "${CMAKE_INSTALL_LIBDIR}/cmake/qltypes")
+
+install(
+  TARGETS platform qltypes
+  EXPORT qltypesTargets
+  RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}"
+  LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}"
+          COMPONENT runtime
+          NAMELINK_COMPONENT development
+  ARCHIVE DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT development)
+
+qltypes_public_headers(headers)
+foreach(header IN LISTS headers)
+  cmake_path(GET header PARENT_PATH folder)
+  install(FILES "${PROJECT_SOURCE_DIR}/${header}" DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}/${folder}"
+          COMPONENT development)
+endforeach()
+
+configure_package_config_file("${PROJECT_SOURCE_DIR}/cmake/qltypesConfig.cmake.in"
+                              "${PROJECT_BINARY_DIR}/cmake/qltypesConfig.cmake" INSTALL_DESTINATION "${packageDir}")
+# Below 1.0 each minor version may break the interface.
+write_basic_package_version_file("${PROJECT_BINARY_DIR}/cmake/qltypesConfigVersion.cmake"
+                                 COMPATIBILITY SameMinorVersion)
+install(FILES "${PROJECT_BINARY_DIR}/cmake/qltypesConfig.cmake"
+              "${PROJECT_BINARY_DIR}/cmake/qltypesConfigVersion.cmake" DESTINATION "${packageDir}"
+        COMPONENT development)
+install(EXPORT qltypesTargets NAMESPACE qltypes:: DESTINATION "${packageDir}" COMPONENT development)
+
+# The prefix of a .pc file follows from where the file lies, so that a moved tree stays right; folders that are absolute
+# stay absolute.
+function(qltypes_pc_path result dir)
+  if(IS_ABSOLUTE "${dir}")
+    set(${result} "${dir}" PARENT_SCOPE)
+  else()
+    set(${result} "\${prefix}/${dir}" PARENT_SCOPE)
+  endif()
+endfunction()
+if(IS_ABSOLUTE "${CMAKE_INSTALL_LIBDIR}")
+  set(pcPrefix "${CMAKE_INSTALL_PREFIX}")
+else()
+  file(RELATIVE_PATH up "/${CMAKE_INSTALL_LIBDIR}/pkgconfig" "/")
+  string(REGEX REPLACE "/$" "" up "${up}")
+  set(pcPrefix "\${pcfiledir}/${up}")
+endif()
+qltypes_pc_path(pcLibDir "${CMAKE_INSTALL_LIBDIR}")
+qltypes_pc_path(pcIncludeDir "${CMAKE_INSTALL_INCLUDEDIR}")
+foreach(name qltypes qlplatform)
+  configure_file("${PROJECT_SOURCE_DIR}/cmake/${name}.pc.in" "${PROJECT_BINARY_DIR}/cmake/${name}.pc" @ONLY)
+  install(FILES "${PROJECT_BINARY_DIR}/cmake/${name}.pc" DESTINATION "${CMAKE_INSTALL_LIBDIR}/pkgconfig"
+          COMPONENT development)
+endforeach()

@@ -1,0 +1,20 @@
+# Installs the build into a fresh folder and moves that elsewhere: nothing installed may remember where it was.
+file(REMOVE_RECURSE "${STAGE}" "${MOVED}")
+execute_process(COMMAND "${CMAKE_COMMAND}" --install "${BUILD_DIR}" --prefix "${STAGE}" COMMAND_ERROR_IS_FATAL ANY
+                OUTPUT_QUIET)
+file(RENAME "${STAGE}" "${MOVED}")
+
+file(GLOB_RECURSE hidden "${MOVED}/*_internal.h")
+if(hidden)
+  message(FATAL_ERROR "installed although hidden: ${hidden}")
+endif()
+file(GLOB_RECURSE texts "${MOVED}/*.cmake" "${MOVED}/*.pc" "${MOVED}/*.h")
+foreach(text IN LISTS texts)
+  file(READ "${text}" content)
+  foreach(folder "${STAGE}" "${BUILD_DIR}")
+    string(FIND "${content}" "${folder}" position)
+    if(NOT position EQUAL -1)
+      message(FATAL_ERROR "${text} names ${folder}")
+    endif()
+  endforeach()
+endforeach()

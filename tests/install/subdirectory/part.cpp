@@ -1,0 +1,3 @@
+#include "qltypes/host/Version.h"
+
+const char* versionThroughPart() { return QLTypeSys::libraryVersion(); }
