@@ -2,6 +2,9 @@
 //
 // The real-world value of a stored integer Q is SlopeAdjustmentFactor * 2^FixedExponent * Q + Bias.
 // Texts of a record: IdentifierString.h and ConstructorString.h. Records of the built-in types: BuiltInProps.h.
+//
+//   fxpDataTypeProp prop{FXP_DT_FIXPT, 1, 16, 0, -7, 1.0, 0.0, 0}; // signed, 16 bits, 7 of them fraction
+//   if (!prop.validateFxpDTProp()) displayFxpDTP(&prop);
 #pragma once
 
 #include "qlplatform/Export.h"
@@ -33,8 +36,9 @@ enum fxpModeOverflow_tag : int {
     FXP_OVERFLOW_SATURATE = 1, ///< the nearest end of the range
 };
 
-/// What a number type is, independently of any table: mode, sign, width in bits, scaling. A plain copyable value.
-struct fxpDataTypeProp {
+/// What a number type is, independently of any table: mode, sign, width in bits, scaling. A plain copyable value; any
+/// field values can be held, and the checks say whether they make sense.
+struct QL_EXPORT fxpDataTypeProp {
     fxpModeDataType DataTypeMode;
     unsigned int Signedness;      ///< 1 signed, 0 unsigned, 2 left open
     int WordLength;               ///< total bits
@@ -43,4 +47,42 @@ struct fxpDataTypeProp {
     double SlopeAdjustmentFactor; ///< at least 1.0 and below 2.0; 1.0 where there is none
     double Bias;                  ///< 0.0 where there is none
     int DataTypeOverrideOff;      ///< 1 when the type's text carried 'DataTypeOverride','Off'
+
+    /// Whether `wordLength` is above 0. There is no upper limit.
+    static bool preValidateWordLength(int wordLength);
+    static bool preValidateWordLength(unsigned int wordLength);
+
+    /// Whether `slopeAdjustmentFactor` is at least 1.0 and below 2.0.
+    static bool preValidateSlopeAdjustmentFactor(double slopeAdjustmentFactor);
+
+    /// Whether `totalSlope`, the factor times 2^FixedExponent, is finite and above 0.0.
+    static bool preValidateTotalSlope(double totalSlope);
+
+    /// Whether `bias` is finite.
+    static bool preValidateBias(double bias);
+
+    /// Whether the values make sense together. Note the order: the factor comes before the two exponents.
+    /// Fixed point and scaled double leave sign and `fixedExponent` open; the floating modes and boolean fix the widths
+    /// and the sign and allow no scaling. A custom float needs enough exponent bits for its width and at least one
+    /// other bit than sign and exponent.
+    static bool preValidateCombo(fxpModeDataType mode, unsigned int signedness, int wordLength,
+                                 double slopeAdjustmentFactor, unsigned int exponentLength, int fixedExponent,
+                                 double bias);
+    static bool preValidateCombo(fxpModeDataType mode, unsigned int signedness, unsigned int wordLength,
+                                 double slopeAdjustmentFactor, unsigned int exponentLength, int fixedExponent,
+                                 double bias);
+
+    /// preValidateCombo of the record's own fields, the word length as a signed number.
+    bool validateFxpDTProp() const;
 };
+
+/// Returns `ok`; when it is false, first prints "Data Type Assertion" and displayFxpDTP(prop) to standard output.
+/// `prop` is not touched when `ok` is true and may then be null.
+QL_EXPORT bool fxpDtpPreAssert(bool ok, const fxpDataTypeProp* prop);
+
+/// Prints mode, sign, word length and scaling to standard output, one a line. ExponentLength and DataTypeOverrideOff
+/// are not shown. Unchecked: `prop` must not be null.
+QL_EXPORT void displayFxpDTP(const fxpDataTypeProp* prop);
+
+/// The same in one line.
+QL_EXPORT void displayFxpDTPFlat(const fxpDataTypeProp* prop);
