@@ -1,0 +1,346 @@
+// The registry of the data types of one model.
+//
+// A new table holds fifteen fixed types: auto (-1), nine built-in (0 to 8) and five predefined ones (9 to 13). Types of
+// clients follow from 14. An engine derives its own table and overrides the hooks it needs.
+//
+//   QLTypeSys::DataTypeTable table;
+//   const int id = table.registerDataType("Speed", dtSourceFixpt, nullptr);
+//   table.getDataTypeId("Speed") == id;
+//
+// Flat functions over a table pointer, which return diagnostics instead of throwing: DataTypeTableUtils.h and
+// ../structures/StructDataTypeUtils.h. One thread at a time uses a table: even reads fill caches.
+#pragma once
+
+#include <iosfwd>
+#include <map>
+#include <memory>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include <boost/shared_ptr.hpp>
+
+#include "qlplatform/Export.h"
+#include "qltypes/types/DataType.h"
+#include "qltypes/types/TypeIds.h"
+
+class QLRootBD;
+class qlsvDiagnosticImpl;
+struct txArray_tag;
+enum SSImageColorFormat : int;
+enum SSImageDataLayout : int;
+
+namespace QLDateTime {
+class DateTimeType;
+}
+
+namespace QLTypeSys {
+
+class NameIndex;
+struct FixedType;
+class OverriddenObject;
+class OverrideUtils;
+
+/// A client's say in registration.
+class QL_EXPORT ClientDataTypeCheckCallback {
+  public:
+    virtual ~ClientDataTypeCheckCallback();
+    /// Called after each registration with the new record and the caller's block name, which may be null. Throwing an
+    /// IException vetoes the registration.
+    virtual void check(DataType* type, const char* blockName) = 0;
+    /// Called when the table comes back to its fixed types.
+    virtual void reset() = 0;
+};
+
+/// A client's function that registers the custom type of that name and returns its id.
+using CustomDataTypeCallback = int (*)(class DataTypeTable*, const char*);
+
+/// The registry. Virtual operations stand in slot order.
+class QL_EXPORT DataTypeTable {
+  public:
+    DataTypeTable();
+    DataTypeTable(const DataTypeTable&) = delete;
+    DataTypeTable& operator=(const DataTypeTable&) = delete;
+
+    // --- Virtual operations ------------------------------------------------------------------------------------------
+
+    virtual ~DataTypeTable();
+    /// Makes a table for a model; null here.
+    virtual DataTypeTable* CreateDTTable(QLRootBD* model) const;
+    /// Removes all types of clients. Header files of custom types stay, and so do grounds and short names of the fixed
+    /// types.
+    virtual void resetToBuiltin();
+
+    /// Registers a plain type, or answers the id of the name after a check of who registered it. `blockName` names the
+    /// caller for reports and may be null. Raises `InvalidDataType`, `DataType_SameNameAsExistingType`,
+    /// `DataType_WithIntrinsicFixptName`, and what the client's check throws.
+    virtual int registerDataType(const char* name, DataTypeSource source, const char* blockName);
+    /// Registers a second name for the type `aliasedTo`. Raises as registerDataType, and
+    /// `UndefinedDataTypeToBeAliasedTo` and `DataTypeAliasLoop`.
+    virtual int registerAliasDataType(const char* name, DataTypeSource source, int aliasedTo, const char* blockName);
+    /// Registers an empty structure. Raises as registerDataType.
+    virtual int registerStructDataType(const char* name, DataTypeSource source, const char* blockName);
+    /// Registers a string type; 0 is dynamic. A null name is made from the length.
+    virtual int registerStringDataType(unsigned long maxLength, const char* name);
+    /// Registers a date-time type; a null name is made from its scale and storage.
+    virtual int registerDateTimeDataType(const QLDateTime::DateTimeType& type, const char* name);
+    /// Copies a type of another table into this one. Raises as registerDataType.
+    virtual int registerOpaqueDataType(const DataType* source, const char* blockName);
+    /// Registers a matrix of `elementId` with `numDims` dimensions that may change at run time.
+    virtual int registerDynamicMatrixDataType(int elementId, unsigned long numDims);
+    /// Registers an image type.
+    virtual int registerImageDataType(unsigned long numChannels, SSImageColorFormat colorFormat,
+                                      SSImageDataLayout dataLayout, BuiltInDTypeId baseType);
+    /// Buses are a subclass's business: -1 here.
+    virtual int registerBusDataType(const char* name, DataTypeSource source, const char* blockName);
+    /// Whether registering an existing name answers its id (true here) instead of replacing its record.
+    virtual bool shortCircuitRegistration(DataTypeSource source) const;
+
+    // Diagnostics settings; what the numbers mean is the subclass's.
+    virtual int getParameterUnderflowDiagnostic() const;
+    virtual int getParameterOverflowDiagnostic() const;
+    virtual int getParameterPrecisionLossDiagnostic() const;
+    virtual int getFixptConstUnderflowDiagnostic() const;
+    virtual int getFixptConstOverflowDiagnostic() const;
+    virtual int getFixptConstPrecisionLossDiagnostic() const;
+    virtual int getDataOverflowDiagnostic() const;
+    virtual int getDataSaturationDiagnostic() const;
+    virtual bool getUseIntDivNetSlopeOpt() const;
+
+    virtual void print(std::ostream& os) const;
+    /// The property block at the end of the alias chain; `caller` is not used. Raises `InvalidDataTypeId`.
+    virtual const void* getDataTypeProperties(const char* caller, int id) const;
+
+    // Hooks for what only a subclass knows: enumeration objects, the override machinery, code generation.
+    virtual std::unique_ptr<txArray_tag, void (*)(txArray_tag*)>
+    getOrdinalValuesFromEnumObject(const txArray_tag* object) const;
+    virtual bool isOverriddenObjectName(const std::string& name) const;
+    virtual const char* getEnumTypeStringFromValue(int id, int value) const;
+    virtual const char* getEnumTypeStringFromIndex(int id, int index) const;
+    virtual void setSkipForCodeGen(int id);
+    virtual bool getSkipForCodeGen(int id) const;
+    virtual bool getResolvingDataTypeForOverrideUtils() const;
+    virtual boost::shared_ptr<OverrideUtils> getObjectOverrideUtils(const std::string& name) const;
+    virtual void addObjectOverrideUtils(const std::string& name, boost::shared_ptr<OverrideUtils> utils);
+    virtual void addOverriddenObject(const std::string& name, const boost::shared_ptr<OverriddenObject>& object);
+
+    /// Fills the record of a built-in type (or auto) from its row. Raises out of memory.
+    virtual void registerBuiltInDataType(DataType* record, int id);
+    /// Fills the record of a predefined type from its row. Raises out of memory.
+    virtual void registerInternalExtraDataType(DataType* record, int id);
+
+    // --- Lookups -----------------------------------------------------------------------------------------------------
+
+    /// The id of a name; -10 when it is unknown or null.
+    int getDataTypeId(const char* name) const;
+    /// The record at a position, which is id + 1. Unchecked: `index` must be below getNumDataTypes().
+    DataType* getDataTypeAt(unsigned long index) const { return dataTypes_[index]; }
+    /// Number of records, auto included.
+    int getNumDataTypes() const { return static_cast<int>(dataTypes_.size()); }
+    bool isDataTypeIdValid(int id) const;
+    bool isDataTypeIdValid_NotAuto(int id) const;
+    /// True for a valid id. Raises `InvalidDataTypeId` for any other.
+    bool checkDataTypeId(int id) const;
+    /// -10 for -10; else what the record says. Unchecked otherwise: `id` must be valid.
+    int getDataTypeIdAliasedTo(int id) const;
+    /// The record that is no alias at the end of the chain. Raises `InvalidDataTypeId`.
+    DataType* getDataTypeAliasedThruTo(int id) const;
+
+    /// True for auto and double.
+    static bool isContextSensitiveOrDouble(int id);
+    /// The id of a built-in name, else -10; null is no name.
+    static int getBuiltInDataType(const char* name);
+    static int getBuiltInDataType(const std::u16string& name);
+    static bool nameOfBuiltInDataType(const char* name);
+    static bool nameOfBuiltInDataType(const std::u16string& name);
+    /// True for "logical", "half", "int64" and "uint64", which are treated as built-in by name.
+    static bool nameOfPseudoBuiltInDataType(const char* name);
+    static bool nameOfPseudoBuiltInDataType(const std::u16string& name);
+    /// The name of ids 0 to 8. Raises `InvalidBuiltinDataTypeId`.
+    static const char* getNameOfBuiltInDataType(int id);
+    /// Bytes of a fixed type. Unchecked: `id` must be -1 to 8.
+    static int getBuiltInDataTypeSize(int id);
+    /// The number record of ids 0 to 8. Raises `InvalidBuiltinDataTypeId`.
+    static const fxpDataTypeProp& getBuiltinDataTypeProperties(int id);
+    static int getNumBuiltInDataTypes();
+    static bool isPredefinedDataType(int id);
+    /// Whether the name is an identifier; false for null.
+    static bool isAValidDataType(const char* name);
+
+    bool IsStringDataType(int id) const;
+    bool isEnumType(int id) const;
+    /// True for auto too. Raises `InvalidDataTypeId` for -10.
+    bool IsDataTypeNumericNonBoolean(int id) const;
+    /// True for auto too. Raises `InvalidDataTypeId` for -10.
+    bool IsDataTypeNumericOrBoolean(int id) const;
+    bool IsFixptDTNotScaledDouble(int id) const;
+    bool Is64BitType(int id) const;
+    bool IsImplementedAsDynamicMatrixDataType(int id) const;
+    /// The type under which values are logged: built-ins as they are, enumerations by storage, all else as double.
+    int getDataTypeLoggingId(int id) const;
+    /// Unchecked: the record at `id` must be a date-time record.
+    const QLDateTime::DateTimeType& getDateTimeType(int id) const;
+
+    // --- Registration ------------------------------------------------------------------------------------------------
+
+    /// Appends a record and enters its name; a name that is there keeps its old entry. Takes the record over.
+    void addDataType(DataType* record);
+    /// Undoes the registration just made: erases the record's name and deletes the last record, whatever `record` is.
+    void removeDataType(DataType* record);
+    /// registerDataType for callers that take no exceptions. Null on success; `id` is untouched on failure.
+    static qlsvDiagnosticImpl* RegisterDataType(DataTypeTable* table, const char* blockName, const char* name,
+                                                DataTypeSource source, int* id);
+    /// Raises `InvalidDataType` for a name that is no identifier.
+    static void validateDataTypeName(const char* name);
+    /// Raises `DataType_WithIntrinsicFixptName`.
+    [[noreturn]] static void throwDataTypeNameIntrinsicFixptError(const char* name);
+    /// Whether the name has fixed-point shape; then `wordLength`, unless null, receives its word length in bits.
+    static bool isInstrinsicFixptName(const char* name, int* wordLength);
+    /// Raises `DataType_SameNameAsExistingType` unless the sources agree, the record is anonymous or `source` opaque.
+    void verifyDataTypeSourcesMatch(DataTypeSource source, int id) const;
+    /// Sets whether a fixed-point record is atomic, by the record of its word length.
+    void initializeFixptDataTypeAtomicity(DataType* record, int wordLength) const;
+    /// The word length in bits that a fixed-point name stands for.
+    static int getFixptDataTypeAtomicityBits(const char* name);
+    /// "rtt_0", "rtt_1" ...; good until the next call.
+    const char* generateAnonymousTypeName() const;
+
+    // --- Aliases, replacement, custom types --------------------------------------------------------------------------
+
+    /// Puts `replacement`, which is the last record, in the place of `old`, which is deleted.
+    void replaceDataType(DataType* old, DataType* replacement);
+    /// Turns a plain record that is not defined yet into an alias under its identifier. Raises
+    /// `UndefinedDataTypeToBeAliasedTo`, `InconsistentDataTypeIdAliasedTo`, `CannotSetAliasForDefinedType` and
+    /// `DataTypeAliasLoop`; the table is then unchanged.
+    void setDataTypeIdAliasedTo(int id, int target);
+    /// Whether the alias chain of `id` passes `target`.
+    bool alreadyAliasedToDirectlyOrIndirectly(int id, int target) const;
+    /// The first type that both alias chains share, or -10.
+    int getDataTypeIdCommonAncestor(int a, int b) const;
+    /// Sets the type whose layout values have, once. Raises `CannotSetPropertyOfAliasType`,
+    /// `IllegalDataTypeToBeStorageId` and `InconsistentDataTypeStorageId`.
+    void setDataTypeStorageId(int id, int storageId);
+    /// The type as host-language text, such as "Bus: Engine" or "fixdt('sfix16_En7')".
+    std::string getDTACompliantString(int id) const;
+
+    bool hasCustomDataTypeCallback(const char* name) const;
+    /// Enters a function under a name; the first one stays.
+    void insertCustomDataTypeCallback(const char* name, CustomDataTypeCallback callback);
+    /// Calls the function. Unchecked: the name must have one.
+    int executeCustomDataTypeCallback(const char* name);
+    std::vector<std::string> getAllCustomDataTypeName() const;
+    /// Enters the header file of a custom type; the first one stays, also over resetToBuiltin.
+    void insertCustomDataTypeHeaderFilePair(const std::string& type, const std::string& header);
+    /// The header file; two double quotes for an unknown type.
+    std::string getHeaderFileForCustomType(const std::string& type) const;
+
+    // --- Values by identifier. Unchecked: `id` must be valid. Destination before source. -----------------------------
+
+    void construct(int id, void* p) const;
+    void destruct(int id, void* p) const;
+    void deepCopy(int id, void* dst, const void* src) const;
+    void serialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const;
+    void deserialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const;
+    unsigned long serializeSize(int id, const void* p) const;
+    unsigned long sizeOf(int id) const;
+    void* containedData(int id, void* p) const;
+    int containedDataType(int id) const;
+    unsigned long containedDataNumDims(int id) const;
+    void containedDataDims(int id, const void* p, unsigned long* dims) const;
+    /// True on success, false when the function of the type failed.
+    bool dataConstruct(int id, unsigned long numDims, const unsigned long* dims, unsigned long elementSize,
+                       const void* data, void* dst) const;
+
+    // The same as bool: false when an IException was thrown, which is then discarded.
+    bool constructWithStatus(int id, void* p) const;
+    bool destructWithStatus(int id, void* p) const;
+    bool deepCopyWithStatus(int id, void* dst, const void* src) const;
+    bool serializeWithStatus(int id, void* dst, const void* src, unsigned long a, unsigned long b) const;
+    bool deserializeWithStatus(int id, void* dst, const void* src, unsigned long a, unsigned long b) const;
+    bool convertToUsingSrcIdWithStatus(int dstId, int srcId, int count, const void* src, const void* aux,
+                                       void* dst) const;
+    bool isPositiveWithStatus(int id, int count, const void* data, const void* aux, void* result) const;
+
+    // Raise `DataTypeFcnDoesNotExist` and `DataTypeFcnUnknownError`. Results are one byte an element; `aux` is handed
+    // to the function of the type.
+
+    /// Converts with the source type's function.
+    void convertToUsingSrcId(int dstId, int srcId, int count, const void* src, const void* aux, void* dst) const;
+    /// Converts with the destination type's function.
+    void convertToUsingDstId(int dstId, int srcId, int count, const void* src, const void* aux, void* dst) const;
+    /// 1 above zero, 0 for zero, -1 for all else, NaN included.
+    void sign(int id, const void* src, const void* aux, signed char* result) const;
+    void isPositive(int id, int count, const void* data, const void* aux, void* result) const;
+    void isPositive(int id, const void* data, const void* aux, signed char* result) const;
+    void isNegative(int id, int count, const void* data, const void* aux, void* result) const;
+    int greaterThan(int id, int count, const void* left, const void* right, const void* aux, void* result) const;
+    int greaterEqual(int id, int count, const void* left, const void* right, const void* aux, void* result) const;
+    /// Whether any value differs from the type's ground: doubles and singles by value, all else by bytes.
+    bool checkIfNonZeroArray(const void* data, int count, int id, bool isComplex) const;
+    /// setSize as a diagnostic. Null on success.
+    qlsvDiagnosticImpl* setDataTypeSize(int id, int size);
+
+    // --- Structures. Unchecked: the record at `id` must be a structure. ----------------------------------------------
+
+    bool doesBusDTHaveComplexData(int id) const;
+    bool doesBusDTHaveFrameBasedElements(int id) const;
+    bool doesBusDTHaveVarDims(int id) const;
+    bool doesBusDTHaveAoB(int id) const;
+    bool doesBusDTHaveStringData(int id) const;
+    bool doesBusDTHaveConstructFcn(int id) const;
+    bool doesBusDTHaveDestructFcn(int id) const;
+    bool doesBusDTHaveDeepCopyFcn(int id) const;
+    bool doesBusDTHaveHalfPrecisionData(int id) const;
+    void doesBusDTContainArraysOfBusesOrVarDimsOrFrames(int id, bool* arraysOfBuses, bool* varDims, bool* frames) const;
+    long getDataTypeRawElementIdxFromImmediateElementIdx(int id, long index) const;
+    double getDataTypeFlatElementMin(int id, long index) const;
+    double getDataTypeDFSElementMax(int id, long index) const;
+    double getDataTypeDFSElementMin(int id, long index) const;
+    double getDataTypeElementMax(int id, long index) const;
+    double getDataTypeElementMin(int id, long index) const;
+
+    // --- Data of clients ---------------------------------------------------------------------------------------------
+
+    /// The block handed to type functions; its first word is this table.
+    _qlDataTypeAccess_tag* getDataTypeAccess() const { return dataTypeAccess_; }
+    /// Takes over a block from utCalloc. The one before is the caller's.
+    void setDataTypeAccess(_qlDataTypeAccess_tag* access) { dataTypeAccess_ = access; }
+    qlsvDiagnosticImpl* getDtaErrorQueue() const { return dtaErrorQueue_; }
+    void setDtaErrorQueue(qlsvDiagnosticImpl* queue) { dtaErrorQueue_ = queue; }
+
+  protected:
+    boost::shared_ptr<ClientDataTypeCheckCallback> clientDataTypeCheckCallback_;
+    std::map<std::string, boost::shared_ptr<OverriddenObject>> overrideObjects_; // for subclasses
+    std::vector<DataType*> dataTypes_;                                           // owned; position is id + 1
+    std::unique_ptr<NameIndex> dataTypeIdsByName_;
+    mutable int anonymousTypeCount_ = 0;
+    mutable char anonymousTypeName_[36];
+    _qlDataTypeAccess_tag* dataTypeAccess_ = nullptr; // owned, from utCalloc
+    void* reservedPointer_ = nullptr;                 // for subclasses
+    int reservedIndex_ = -1;                          // for subclasses; -1 again after resetToBuiltin
+    qlsvDiagnosticImpl* dtaErrorQueue_ = nullptr;     // not owned
+    void* secondReservedPointer_ = nullptr;           // for subclasses
+    std::vector<int> fixptAtomicWordLengths_;         // beyond 8, 16 and 32 bits
+    std::unordered_map<std::string, CustomDataTypeCallback> customDataTypeCallbacks_;
+    std::unordered_map<std::string, std::string> customDataTypeHeaderFiles_;
+
+  private:
+    void initialize();
+    static void fillFromRow(DataType* record, const FixedType& row);
+    static void clearStructureCaches(DataType* record);
+    DataType* recordAt(int id) const { return dataTypes_[static_cast<std::size_t>(id + 1)]; }
+    /// Whether `name` is registered and stands as it is; `existing` is its id in any case.
+    bool isRegisteredAlready(const char* name, DataTypeSource source, int& existing) const;
+    int nextId() const { return getNumDataTypes() - 1; }
+    /// Last steps of every registration: add, let the client check, replace `existing` unless it is -10.
+    int enter(std::unique_ptr<DataType> record, int existing, const char* blockName);
+    void checkWithClient(DataType* record, const char* blockName);
+    bool isNumeric(int id, int highestBuiltIn) const;
+    void convert(const DataType* chosen, int dstId, int srcId, int count, const void* src, const void* aux,
+                 void* dst) const;
+};
+
+/// Prints through the table's virtual print().
+QL_EXPORT std::ostream& operator<<(std::ostream& os, const DataTypeTable& table);
+
+} // namespace QLTypeSys

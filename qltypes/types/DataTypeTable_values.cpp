@@ -1,0 +1,165 @@
+// Operations on values by identifier. Each finds the record and hands on; conversion and comparison also test that the
+// type has the function, and pass resolved identifiers.
+#include <cstring>
+
+#include "qltypes/host/Failure_internal.h"
+#include "qltypes/types/DataTypeTable.h"
+
+namespace QLTypeSys {
+
+namespace {
+
+// Whether any of `count` floating values is not equal to zero; NaN is not, -0.0 is.
+template <class T> bool anyNonZero(const void* data, long count) {
+    const T* values = static_cast<const T*>(data);
+    for (long i = 0; i < count; ++i)
+        if (values[i] != T{}) return true;
+    return false;
+}
+
+} // namespace
+
+// clang-format off
+
+// --- One value -------------------------------------------------------------------------------------------------------
+
+void DataTypeTable::construct(int id, void* p) const                                       { recordAt(id)->constructScalarElement(p); }
+void DataTypeTable::destruct(int id, void* p) const                                        { recordAt(id)->destroyScalarElement(p); }
+void DataTypeTable::deepCopy(int id, void* dst, const void* src) const                     { recordAt(id)->deepCopyScalarElement(src, dst); }
+void DataTypeTable::serialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const   { recordAt(id)->serializeScalarElement(src, dst, a, b); }
+void DataTypeTable::deserialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const { recordAt(id)->deserializeScalarElement(src, dst, a, b); }
+unsigned long DataTypeTable::serializeSize(int id, const void* p) const                    { return recordAt(id)->serializeSizeScalarElement(p); }
+unsigned long DataTypeTable::sizeOf(int id) const                                          { return recordAt(id)->sizeOf(); }
+void* DataTypeTable::containedData(int id, void* p) const                                  { return recordAt(id)->containedData(p); }
+int DataTypeTable::containedDataType(int id) const                                         { return recordAt(id)->containedDataType(); }
+unsigned long DataTypeTable::containedDataNumDims(int id) const                            { return recordAt(id)->containedDataNumDims(); }
+void DataTypeTable::containedDataDims(int id, const void* p, unsigned long* dims) const    { recordAt(id)->containedDataDims(p, dims); }
+// clang-format on
+
+bool DataTypeTable::dataConstruct(int id, unsigned long numDims, const unsigned long* dims, unsigned long elementSize,
+                                  const void* data, void* dst) const {
+    return failure::succeeds([&] { recordAt(id)->dataConstruct(numDims, dims, elementSize, data, dst); });
+}
+
+// --- With status: these seven and no others (kept) -------------------------------------------------------------------
+
+bool DataTypeTable::constructWithStatus(int id, void* p) const {
+    return failure::succeeds([&] { construct(id, p); });
+}
+bool DataTypeTable::destructWithStatus(int id, void* p) const {
+    return failure::succeeds([&] { destruct(id, p); });
+}
+bool DataTypeTable::deepCopyWithStatus(int id, void* dst, const void* src) const {
+    return failure::succeeds([&] { deepCopy(id, dst, src); });
+}
+bool DataTypeTable::serializeWithStatus(int id, void* dst, const void* src, unsigned long a, unsigned long b) const {
+    return failure::succeeds([&] { serialize(id, dst, src, a, b); });
+}
+bool DataTypeTable::deserializeWithStatus(int id, void* dst, const void* src, unsigned long a, unsigned long b) const {
+    return failure::succeeds([&] { deserialize(id, dst, src, a, b); });
+}
+bool DataTypeTable::convertToUsingSrcIdWithStatus(int dstId, int srcId, int count, const void* src, const void* aux,
+                                                  void* dst) const {
+    return failure::succeeds([&] { convertToUsingSrcId(dstId, srcId, count, src, aux, dst); });
+}
+bool DataTypeTable::isPositiveWithStatus(int id, int count, const void* data, const void* aux, void* result) const {
+    return failure::succeeds([&] { isPositive(id, count, data, aux, result); });
+}
+
+// --- Conversion and comparison ---------------------------------------------------------------------------------------
+
+namespace {
+
+// The function, or the failure that says that `record` has none.
+template <class F> F existing(F function, const char* name, const DataType* record) {
+    if (!function) failure::raise(QuillaneTypes::general::DataTypeFcnDoesNotExist(name, record->getName()));
+    return function;
+}
+
+// A function's answer, or the failure that it stands for when it is 0.
+int succeeded(int answer, const char* operation, const DataType* record) {
+    if (!answer) failure::raise(QuillaneTypes::general::DataTypeFcnUnknownError(operation, record->getName()));
+    return answer;
+}
+
+} // namespace
+
+void DataTypeTable::convert(const DataType* chosen, int dstId, int srcId, int count, const void* src, const void* aux,
+                            void* dst) const {
+    const ConvertBetweenFcn f = existing(chosen->getConvertBetweenFcn(), "ConvertBetweenFcn", chosen);
+    succeeded(f(dataTypeAccess_, nullptr, recordAt(dstId)->getIdAliasedThruTo(), recordAt(srcId)->getIdAliasedThruTo(),
+                count, src, aux, dst),
+              "ConvertBetween", chosen);
+}
+
+void DataTypeTable::convertToUsingSrcId(int dstId, int srcId, int count, const void* src, const void* aux,
+                                        void* dst) const {
+    convert(recordAt(srcId), dstId, srcId, count, src, aux, dst);
+}
+
+void DataTypeTable::convertToUsingDstId(int dstId, int srcId, int count, const void* src, const void* aux,
+                                        void* dst) const {
+    convert(recordAt(dstId), dstId, srcId, count, src, aux, dst);
+}
+
+void DataTypeTable::sign(int id, const void* src, const void* aux, signed char* result) const {
+    double value = 0.0;
+    convertToUsingSrcId(DATA_TYPE_ID_DOUBLE, id, 1, src, aux, &value);
+    *result = value > 0.0 ? 1 : value == 0.0 ? 0 : -1; // kept: NaN is negative
+}
+
+void DataTypeTable::isPositive(int id, int count, const void* data, const void* aux, void* result) const {
+    const DataType* record = recordAt(id);
+    const IsPositiveFcn f = existing(record->getIsPositiveFcn(), "IsPositiveFcn", record);
+    succeeded(f(dataTypeAccess_, nullptr, record->getIdAliasedThruTo(), count, data, aux, result), "IsPositive",
+              record);
+}
+
+void DataTypeTable::isPositive(int id, const void* data, const void* aux, signed char* result) const {
+    unsigned long answer = 0; // a type's function may write more than one byte
+    isPositive(id, 1, data, aux, &answer);
+    *result = answer != 0;
+}
+
+void DataTypeTable::isNegative(int id, int count, const void* data, const void* aux, void* result) const {
+    const DataType* record = recordAt(id);
+    const IsNegativeFcn f = existing(record->getIsNegativeFcn(), "IsNegativeFcn", record);
+    succeeded(f(dataTypeAccess_, nullptr, record->getIdAliasedThruTo(), count, data, aux, result), "IsNegative",
+              record);
+}
+
+int DataTypeTable::greaterThan(int id, int count, const void* left, const void* right, const void* aux,
+                               void* result) const {
+    const DataType* record = recordAt(id);
+    const GreaterThanFcn f = existing(record->getGreaterThanFcn(), "GreaterThanFcn", record);
+    return succeeded(f(dataTypeAccess_, nullptr, record->getIdAliasedThruTo(), count, left, right, aux, result),
+                     "GreaterThan", record);
+}
+
+int DataTypeTable::greaterEqual(int id, int count, const void* left, const void* right, const void* aux,
+                                void* result) const {
+    const DataType* record = recordAt(id);
+    const GreaterEqualFcn f = existing(record->getGreaterEqualFcn(), "GreaterEqualFcn", record);
+    return succeeded(f(dataTypeAccess_, nullptr, record->getIdAliasedThruTo(), count, left, right, aux, result),
+                     "GreaterEqual", record);
+}
+
+bool DataTypeTable::checkIfNonZeroArray(const void* data, int count, int id, bool isComplex) const {
+    if (count < 1) return false;
+    const long numParts = isComplex ? 2L * count : count;
+    if (id == DATA_TYPE_ID_DOUBLE) return anyNonZero<double>(data, numParts);
+    if (id == DATA_TYPE_ID_SINGLE) return anyNonZero<float>(data, numParts);
+    const DataType* record = recordAt(id);
+    const void* ground = record->getGround();
+    const auto size = static_cast<std::size_t>(record->getSize());
+    const auto* part = static_cast<const unsigned char*>(data);
+    for (long i = 0; i < numParts; ++i, part += size)
+        if (std::memcmp(part, ground, size) != 0) return true;
+    return false;
+}
+
+qlsvDiagnosticImpl* DataTypeTable::setDataTypeSize(int id, int size) {
+    return failure::diagnosticFrom([&] { recordAt(id)->setSize(size); });
+}
+
+} // namespace QLTypeSys
