@@ -1,0 +1,50 @@
+#include "qltypes/conversion/BuiltInConversion.h"
+
+#include "qltypes/conversion/Layout_internal.h"
+#include "qltypes/conversion/Levels_internal.h"
+#include "qltypes/host/Assert_internal.h"
+
+namespace QLTypeSys::conversion {
+
+namespace {
+
+// Runs up to this many elements go straight to the level: they are far from leaving the caches.
+constexpr std::size_t shortRun = 1 << 16;
+
+// One function of the matrix.
+template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
+bool convertVector(const void* src, void* dst, std::size_t srcCount, std::size_t dstCount, bool srcComplex,
+                   bool dstComplex, bool check, int, int, fxpModeOverflow_tag, fxpModeRounding_tag) {
+    constexpr const Cell& cell = cellOf<S, D, rounding, overflow>;
+    const Vectors vectors = {
+        static_cast<const std::byte*>(src), static_cast<std::byte*>(dst), srcCount, dstCount, srcComplex, dstComplex};
+    const bool checked = check && !holdsEveryValue<S, D>();
+    if (!checked && !srcComplex && !dstComplex && srcCount > 1 && dstCount - 1 < shortRun) {
+        levelInUse->convert[cell.slot](vectors.src, vectors.dst, dstCount);
+        return true;
+    }
+    return convertInLayout(cell, vectors, checked);
+}
+
+// Booleans are read as uint8 and share its functions, but for the copy to int8.
+template <class S, class D>
+using SourceOf = std::conditional_t<isBoolean<S> && !std::is_same_v<D, std::int8_t>, std::uint8_t, S>;
+template <class S, class D> using DestinationOf = std::conditional_t<isBoolean<S> && isBoolean<D>, std::uint8_t, D>;
+
+constexpr SlotTable<BuiltInConvFcn> functions = slotTable<BuiltInConvFcn>(
+    []<class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>() -> BuiltInConvFcn {
+        return &convertVector<SourceOf<S, D>, DestinationOf<S, D>, rounding, overflow>;
+    });
+
+} // namespace
+
+} // namespace QLTypeSys::conversion
+
+BuiltInConvFcn utGetQlBuiltinDtypeConvFcn(int srcId, int dstId, fxpModeOverflow_tag overflow,
+                                          fxpModeRounding_tag rounding) {
+    using namespace QLTypeSys::conversion;
+    QLTYPES_ASSERT(srcId >= 0 && srcId < numTypes && dstId >= 0 && dstId < numTypes);
+    QLTYPES_ASSERT(overflow == FXP_OVERFLOW_WRAP || overflow == FXP_OVERFLOW_SATURATE);
+    QLTYPES_ASSERT(rounding >= FXP_ROUND_ZERO && rounding <= FXP_ROUND_HALF_EVEN);
+    return functions[slotOf(srcId, dstId, overflow, rounding)];
+}
