@@ -30,7 +30,7 @@ DataType::~DataType() {
     constructedGround_ = false;
     utFree(properties_);
     utFree(ground_);
-    if (interface_) txDestroyArray(interface_);
+    txDestroyArray(interface_);
 }
 
 // --- Setter families -------------------------------------------------------------------------------------------------
@@ -314,8 +314,8 @@ void DataType::setChecksumElements(const unsigned int* words) {
 }
 
 void DataType::setInterface(txArray_tag* array) {
-    if (interface_) txDestroyArray(interface_);
-    if (array) txKeepArray(array);
+    if (array) txKeepArray(array); // before the old one goes: it may be the same
+    txDestroyArray(interface_);
     interface_ = array;
 }
 

@@ -9,7 +9,6 @@
 #include <ostream>
 #include <string_view>
 
-#include "qlplatform/arrays/HostArray.h"
 #include "qlplatform/memory/Memory.h"
 #include "qlplatform/strings/Strings.h"
 #include "qltypes/fixed_point/BuiltInProps.h"
@@ -116,15 +115,11 @@ const char* DataTypeTable::getEnumTypeStringFromIndex(int, int) const           
 void DataTypeTable::setSkipForCodeGen(int)                                          {}
 bool DataTypeTable::getSkipForCodeGen(int) const                                    { return false; }
 bool DataTypeTable::getResolvingDataTypeForOverrideUtils() const                    { return false; }
+txArrayPtr DataTypeTable::getOrdinalValuesFromEnumObject(const txArray_tag*) const { return {}; }
 boost::shared_ptr<OverrideUtils> DataTypeTable::getObjectOverrideUtils(const std::string&) const { return {}; }
 void DataTypeTable::addObjectOverrideUtils(const std::string&, boost::shared_ptr<OverrideUtils>) {}
 void DataTypeTable::addOverriddenObject(const std::string&, const boost::shared_ptr<OverriddenObject>&) {}
 // clang-format on
-
-std::unique_ptr<txArray_tag, void (*)(txArray_tag*)>
-DataTypeTable::getOrdinalValuesFromEnumObject(const txArray_tag*) const {
-    return {nullptr, txDestroyArray};
-}
 
 const void* DataTypeTable::getDataTypeProperties(const char*, int id) const {
     return getDataTypeAliasedThruTo(id)->getProperties();

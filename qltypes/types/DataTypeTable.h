@@ -21,12 +21,12 @@
 #include <boost/shared_ptr.hpp>
 
 #include "qlplatform/Export.h"
+#include "qlplatform/arrays/HostArray.h"
 #include "qltypes/types/DataType.h"
 #include "qltypes/types/TypeIds.h"
 
 class QLRootBD;
 class qlsvDiagnosticImpl;
-struct txArray_tag;
 enum SSImageColorFormat : int;
 enum SSImageDataLayout : int;
 
@@ -112,8 +112,7 @@ class QL_EXPORT DataTypeTable {
     virtual const void* getDataTypeProperties(const char* caller, int id) const;
 
     // Hooks for what only a subclass knows: enumeration objects, the override machinery, code generation.
-    virtual std::unique_ptr<txArray_tag, void (*)(txArray_tag*)>
-    getOrdinalValuesFromEnumObject(const txArray_tag* object) const;
+    virtual txArrayPtr getOrdinalValuesFromEnumObject(const txArray_tag* object) const;
     virtual bool isOverriddenObjectName(const std::string& name) const;
     virtual const char* getEnumTypeStringFromValue(int id, int value) const;
     virtual const char* getEnumTypeStringFromIndex(int id, int index) const;
