@@ -1,0 +1,206 @@
+#include "description/JsonReader.h"
+
+#include <algorithm>
+#include <cmath>
+#include <initializer_list>
+#include <set>
+#include <string_view>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+#include <nlohmann/json.hpp>
+
+#include "qlplatform/strings/Strings.h"
+
+namespace inspector {
+namespace {
+
+using Json = nlohmann::json;
+
+// A value of the document with the way that leads to it.
+class Node {
+  public:
+    Node(const Json& json, const std::string& file, std::string pointer)
+        : json_(json), place_{file, std::move(pointer)} {}
+
+    const Place& place() const { return place_; }
+
+    [[noreturn]] void complain(const std::string& complaint) const {
+        throw InputError(place_, place_.within.empty() ? "the document " + complaint : complaint);
+    }
+
+    /// Complains unless this is an object whose keys are all known.
+    const Node& asObject(std::initializer_list<std::string_view> knownKeys) const {
+        if (!json_.is_object()) complain(wanted("an object"));
+        for (const auto& [key, value] : json_.items()) {
+            if (std::find(knownKeys.begin(), knownKeys.end(), key) == knownKeys.end())
+                complain(fmt::format("must not have the key {} (known: {})", Json(key).dump(), fmt::join(knownKeys, ", ")));
+        }
+        return *this;
+    }
+
+    bool has(const char* key) const { return json_.contains(key); }
+
+    Node at(const char* key) const {
+        if (!has(key)) complain(fmt::format("must have the key '{}'", key));
+        return {json_[key], place_.file, place_.within + "/" + key};
+    }
+
+    /// Complains unless this is an array of at least one item.
+    std::size_t numItems() const {
+        if (!json_.is_array()) complain(wanted("an array"));
+        if (json_.empty()) complain("must have at least one item");
+        return json_.size();
+    }
+
+    Node item(std::size_t index) const {
+        return {json_[index], place_.file, place_.within + "/" + std::to_string(index)};
+    }
+
+    const std::string& asText() const {
+        if (!json_.is_string()) complain(wanted("a string"));
+        return json_.get_ref<const std::string&>();
+    }
+
+    const std::string& asIdentifier() const {
+        const std::string& text = asText();
+        if (!qlIsValidANSICIdentifier(text.c_str(), true) || text.find('\0') != std::string::npos)
+            complain(fmt::format("must be an identifier, not {}", json_.dump()));
+        return text;
+    }
+
+    bool asBool() const {
+        if (!json_.is_boolean()) complain(wanted("true or false"));
+        return json_.get<bool>();
+    }
+
+    double asNumber() const {
+        if (!json_.is_number()) complain(wanted("a number"));
+        return json_.get<double>();
+    }
+
+    /// A number without a fraction, however it is written (4, 4.0), from 1 to the largest 32-bit integer.
+    std::int32_t asCount() const {
+        constexpr std::int32_t largest = std::numeric_limits<std::int32_t>::max();
+        const double number = asNumber();
+        if (!(number >= 1.0 && number <= largest) || number != std::floor(number))
+            complain(fmt::format("must be a whole number from 1 to {}, not {}", largest, json_.dump()));
+        return static_cast<std::int32_t>(number);
+    }
+
+    /// True for the second of two words, false for the first.
+    bool asSecondOf(std::string_view first, std::string_view second) const {
+        const std::string& word = asText();
+        if (word != first && word != second)
+            complain(fmt::format("must be \"{}\" or \"{}\", not {}", first, second, json_.dump()));
+        return word == second;
+    }
+
+  private:
+    std::string wanted(const char* what) const {
+        const char* const article = json_.is_null() ? "" : json_.is_array() || json_.is_object() ? "an " : "a ";
+        return fmt::format("must be {}, not {}{}", what, article, json_.type_name());
+    }
+
+    const Json& json_;
+    Place place_;
+};
+
+ElementDescription readElement(const Node& node) {
+    node.asObject({"name", "type", "dimensions", "complex", "min", "max", "unit", "sampling", "dimensionsMode"});
+    ElementDescription element;
+    element.name = node.at("name").asIdentifier();
+    element.type = {node.at("type").asIdentifier(), node.at("type").place()};
+    if (node.has("dimensions")) {
+        const Node dimensions = node.at("dimensions");
+        element.dimensions.clear();
+        for (std::size_t i = 0; i < dimensions.numItems(); ++i)
+            element.dimensions.push_back(dimensions.item(i).asCount());
+        if (!isWidthInRange(element.dimensions))
+            dimensions.complain(fmt::format("multiply to more than {}", largestWidth));
+    }
+    if (node.has("complex")) element.isComplex = node.at("complex").asBool();
+    if (node.has("min")) element.min = node.at("min").asNumber();
+    if (node.has("max")) element.max = node.at("max").asNumber();
+    if (node.has("unit")) element.unit = node.at("unit").asText();
+    if (node.has("sampling")) element.isFrameBased = node.at("sampling").asSecondOf("sample", "frame");
+    if (node.has("dimensionsMode"))
+        element.hasVariableDimensions = node.at("dimensionsMode").asSecondOf("fixed", "variable");
+    return element;
+}
+
+StructureDescription readStructure(const Node& elements) {
+    StructureDescription structure;
+    std::set<std::string_view> names;
+    const std::size_t numElements = elements.numItems();
+    structure.elements.reserve(numElements);
+    for (std::size_t i = 0; i < numElements; ++i) {
+        structure.elements.push_back(readElement(elements.item(i)));
+        const std::string& name = structure.elements.back().name;
+        if (!names.insert(name).second)
+            elements.item(i).at("name").complain(fmt::format("'{}' names an earlier element already", name));
+    }
+    return structure;
+}
+
+TypeDescription readType(const Node& node) {
+    node.asObject({"name", "alias", "size", "elements"});
+    TypeDescription type;
+    type.name = node.at("name").asIdentifier();
+    type.label = type.name;
+    type.place = node.place();
+    if (node.has("alias") + node.has("size") + node.has("elements") != 1)
+        node.complain("must have exactly one of the keys 'alias', 'size', 'elements'");
+    if (node.has("alias"))
+        type.kind = AliasDescription{{node.at("alias").asIdentifier(), node.at("alias").place()}};
+    else if (node.has("size"))
+        type.kind = ClientTypeDescription{node.at("size").asCount()};
+    else
+        type.kind = readStructure(node.at("elements"));
+    return type;
+}
+
+// The place of a byte of a text. Columns count bytes from 1.
+Place placeOf(const std::string& file, std::string_view text, std::size_t byte) {
+    const std::string_view before = text.substr(0, byte);
+    const auto line = 1 + std::count(before.begin(), before.end(), '\n');
+    const std::size_t lastBreak = before.rfind('\n');
+    const std::size_t column = 1 + byte - (lastBreak == std::string_view::npos ? 0 : lastBreak + 1);
+    return {file, fmt::format("{}:{}", line, column)};
+}
+
+// What a JSON library's text says after its identifier and position, which are told in our own way.
+std::string reasonOf(const nlohmann::json::exception& error) {
+    const std::string_view text = error.what();
+    const std::size_t lastColon = text.find(": ");
+    std::string reason(lastColon == std::string_view::npos ? text : text.substr(lastColon + 2));
+    std::replace(reason.begin(), reason.end(), '\n', ' ');
+    return "no JSON: " + reason;
+}
+
+Json parse(const std::string& file, const std::string& text) {
+    try {
+        return Json::parse(text);
+    } catch (const Json::parse_error& error) {
+        // `byte` counts from 1 and is that of the last character read.
+        throw InputError(placeOf(file, text, error.byte > 0 ? error.byte - 1 : 0), reasonOf(error));
+    } catch (const Json::exception& error) {
+        throw InputError({file, ""}, reasonOf(error));
+    }
+}
+
+} // namespace
+
+Description readJsonDescription(const std::string& file, const std::string& text) {
+    const Json json = parse(file, text);
+    const Node document(json, file, "");
+    const Node types = document.asObject({"$schema", "types"}).at("types");
+    if (document.has("$schema")) document.at("$schema").asText();
+    Description description;
+    const std::size_t numTypes = types.numItems();
+    description.types.reserve(numTypes);
+    for (std::size_t i = 0; i < numTypes; ++i) description.types.push_back(readType(types.item(i)));
+    return description;
+}
+
+} // namespace inspector

@@ -1,0 +1,97 @@
+#include "output/LayoutText.h"
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+namespace inspector {
+namespace {
+
+std::string nameWithDimensions(const ElementDescription& element) {
+    std::string text = element.name;
+    if (element.dimensions == std::vector<std::int64_t>{1}) return text;
+    for (const std::int64_t dimension : element.dimensions) text += fmt::format("[{}]", dimension);
+    return text;
+}
+
+std::string notesOf(const ElementLayout& element) {
+    const ElementDescription& description = element.description;
+    std::vector<std::string> notes;
+    if (!description.unit.empty()) notes.push_back(fmt::format("unit {}", description.unit));
+    if (std::isfinite(description.min)) notes.push_back(fmt::format("min {}", description.min));
+    if (std::isfinite(description.max)) notes.push_back(fmt::format("max {}", description.max));
+    if (description.isFrameBased) notes.push_back("frame based");
+    if (description.hasVariableDimensions) notes.push_back("variable dimensions");
+    if (element.move) notes.push_back(element.move->reason);
+    return fmt::format("{}", fmt::join(notes, "; "));
+}
+
+std::string structureText(const StructureLayout& structure, const Colours& colours) {
+    TextTable table({{"offset", Align::Right}, {"size", Align::Right}, {"element", Align::Left}, {"type", Align::Left},
+                     {"notes", Align::Left}});
+    const auto number = [](std::int64_t value) { return std::to_string(value); };
+    for (const ElementLayout& element : structure.elements) {
+        const std::string type = (element.description.isComplex ? "complex " : "") + element.typeLabel;
+        table.addRow({number(element.offset), number(element.size), nameWithDimensions(element.description), type,
+                      notesOf(element)});
+        if (element.padding == 0) continue;
+        const bool isLast = &element == &structure.elements.back();
+        table.addRow({number(element.offset + element.size), number(element.padding), "(padding)", "",
+                      isLast ? "size rounded up to a multiple of 8" : ""},
+                     true);
+    }
+    return fmt::format("{}\n{}  {} bytes, {} of them padding; elements: {} immediate, {} flat, {} raw, {} depth-first\n\n",
+                       colours.bold(structure.label), table.text("  ", colours), structure.size, structure.padding,
+                       structure.elements.size(), structure.numFlatElements, structure.numRawElements,
+                       structure.numDFSElements);
+}
+
+std::string otherTypesText(const std::vector<OtherType>& types, const Colours& colours) {
+    TextTable table({{"type", Align::Left}, {"size", Align::Right}, {"kind", Align::Left}});
+    for (const OtherType& type : types)
+        table.addRow({type.name, std::to_string(type.size), type.kind == "alias" ? "alias of " + type.target : type.kind});
+    return fmt::format("{}\n{}\n", colours.bold("Types that are no structures"), table.text("  ", colours));
+}
+
+std::string refusalsText(const std::vector<Refusal>& refusals, const Colours& colours) {
+    TextTable table({{"message", Align::Left}, {"why", Align::Left}});
+    for (const Refusal& refusal : refusals) table.addRow({refusal.label, refusal.reason});
+    return fmt::format("{}\n{}\n", colours.bold("Messages that cannot be expressed"), table.text("  ", colours));
+}
+
+std::string summaryText(const Layout& layout) {
+    if (layout.numMessages == 0) return fmt::format("{} structures laid out\n", layout.structures.size());
+    std::string text = fmt::format("{} messages read, {} laid out, {} refused", layout.numMessages,
+                                   layout.numMessages - layout.refusals.size(), layout.refusals.size());
+    // clang-format off
+    constexpr std::array<std::pair<RefusalKind, const char*>, 4> kinds = {{
+        {RefusalKind::Text,           "have a text"},
+        {RefusalKind::VariableLength, "have an array of any length"},
+        {RefusalKind::NoFields,       "have no fields"},
+        {RefusalKind::UsesRefused,    "contain a refused message"},
+    }};
+    // clang-format on
+    std::vector<std::string> counts;
+    for (const auto& [kind, what] : kinds) {
+        const auto isOfKind = [kind = kind](const Refusal& refusal) { return refusal.kind == kind; };
+        const auto count = std::count_if(layout.refusals.begin(), layout.refusals.end(), isOfKind);
+        if (count > 0) counts.push_back(fmt::format("{} {}", count, what));
+    }
+    if (!counts.empty()) text += fmt::format(": {}", fmt::join(counts, ", "));
+    return text + "\n";
+}
+
+} // namespace
+
+std::string layoutText(const Layout& layout, bool isSelection, const Colours& colours) {
+    std::string text;
+    if (!isSelection && !layout.otherTypes.empty()) text += otherTypesText(layout.otherTypes, colours);
+    for (const StructureLayout& structure : layout.structures) text += structureText(structure, colours);
+    if (!isSelection && !layout.refusals.empty()) text += refusalsText(layout.refusals, colours);
+    return text + summaryText(layout);
+}
+
+} // namespace inspector
