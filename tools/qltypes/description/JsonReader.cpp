@@ -17,6 +17,11 @@ namespace {
 
 using Json = nlohmann::json;
 
+// Complains of a value by its pointer, which is empty for the document as a whole.
+[[noreturn]] void complainOf(const Place& place, const std::string& complaint) {
+    throw InputError(place, place.within.empty() ? "the document " + complaint : complaint);
+}
+
 // A value of the document with the way that leads to it.
 class Node {
   public:
@@ -25,16 +30,15 @@ class Node {
 
     const Place& place() const { return place_; }
 
-    [[noreturn]] void complain(const std::string& complaint) const {
-        throw InputError(place_, place_.within.empty() ? "the document " + complaint : complaint);
-    }
+    [[noreturn]] void complain(const std::string& complaint) const { complainOf(place_, complaint); }
 
     /// Complains unless this is an object whose keys are all known.
     const Node& asObject(std::initializer_list<std::string_view> knownKeys) const {
         if (!json_.is_object()) complain(wanted("an object"));
         for (const auto& [key, value] : json_.items()) {
             if (std::find(knownKeys.begin(), knownKeys.end(), key) == knownKeys.end())
-                complain(fmt::format("must not have the key {} (known: {})", Json(key).dump(), fmt::join(knownKeys, ", ")));
+                complain(
+                    fmt::format("must not have the key {} (known: {})", Json(key).dump(), fmt::join(knownKeys, ", ")));
         }
         return *this;
     }
@@ -160,46 +164,104 @@ TypeDescription readType(const Node& node) {
     return type;
 }
 
-// The place of a byte of a text. Columns count bytes from 1.
-Place placeOf(const std::string& file, std::string_view text, std::size_t byte) {
-    const std::string_view before = text.substr(0, byte);
-    const auto line = 1 + std::count(before.begin(), before.end(), '\n');
-    const std::size_t lastBreak = before.rfind('\n');
-    const std::size_t column = 1 + byte - (lastBreak == std::string_view::npos ? 0 : lastBreak + 1);
-    return {file, fmt::format("{}:{}", line, column)};
-}
+// A first pass over the text, which finds what the tree of values cannot show any more: where the text is no JSON, and
+// keys that stand twice in one object.
+class Checker final : public nlohmann::json_sax<Json> {
+  public:
+    Checker(const std::string& file, std::string_view text) : file_(file), text_(text) {}
 
-// What a JSON library's text says after its identifier and position, which are told in our own way.
-std::string reasonOf(const nlohmann::json::exception& error) {
-    const std::string_view text = error.what();
-    const std::size_t lastColon = text.find(": ");
-    std::string reason(lastColon == std::string_view::npos ? text : text.substr(lastColon + 2));
-    std::replace(reason.begin(), reason.end(), '\n', ' ');
-    return "no JSON: " + reason;
-}
+    bool null() override { return value(); }
+    bool boolean(bool) override { return value(); }
+    bool number_integer(number_integer_t) override { return value(); }
+    bool number_unsigned(number_unsigned_t) override { return value(); }
+    bool number_float(number_float_t, const string_t&) override { return value(); }
+    bool string(string_t&) override { return value(); }
+    bool binary(binary_t&) override { return value(); }
+    bool start_object(std::size_t) override { return open(); }
+    bool end_object() override { return close(); }
+    bool start_array(std::size_t) override { return open(); }
+    bool end_array() override { return close(); }
 
-Json parse(const std::string& file, const std::string& text) {
-    try {
-        return Json::parse(text);
-    } catch (const Json::parse_error& error) {
-        // `byte` counts from 1 and is that of the last character read.
-        throw InputError(placeOf(file, text, error.byte > 0 ? error.byte - 1 : 0), reasonOf(error));
-    } catch (const Json::exception& error) {
-        throw InputError({file, ""}, reasonOf(error));
+    bool key(string_t& key) override {
+        if (!levels_.back().keys.insert(key).second)
+            complainOf({file_, pointer()}, fmt::format("has the key {} twice", Json(key).dump()));
+        levels_.back().key = key;
+        return true;
     }
-}
+
+    bool parse_error(std::size_t numBytesRead, const std::string&, const Json::exception& error) override {
+        throw InputError(placeOf(numBytesRead), "no JSON: " + reasonOf(error));
+    }
+
+  private:
+    struct Level {
+        std::set<std::string> keys; // of an object
+        std::string key;            // of an object: the last one
+        std::size_t numValues = 0;
+    };
+
+    bool value() {
+        if (!levels_.empty()) ++levels_.back().numValues;
+        return true;
+    }
+    bool open() {
+        value();
+        levels_.emplace_back();
+        return true;
+    }
+    bool close() {
+        levels_.pop_back();
+        return true;
+    }
+
+    // Of the innermost value that is open.
+    std::string pointer() const {
+        std::string pointer;
+        for (std::size_t i = 0; i + 1 < levels_.size(); ++i) {
+            const Level& level = levels_[i];
+            const std::string quotedKey = Json(level.key).dump(); // with control characters escaped
+            pointer += "/" + (level.keys.empty() ? std::to_string(level.numValues - 1)
+                                                 : quotedKey.substr(1, quotedKey.size() - 2));
+        }
+        return pointer;
+    }
+
+    // Of the last byte read. Columns count bytes from 1.
+    Place placeOf(std::size_t numBytesRead) const {
+        const std::string_view before = text_.substr(0, numBytesRead > 0 ? numBytesRead - 1 : 0);
+        const auto line = 1 + std::count(before.begin(), before.end(), '\n');
+        const std::size_t lastBreak = before.rfind('\n');
+        const std::size_t column = 1 + before.size() - (lastBreak == std::string_view::npos ? 0 : lastBreak + 1);
+        return {file_, fmt::format("{}:{}", line, column)};
+    }
+
+    // What the library says between its own identifier and position and the bytes that it read last.
+    static std::string reasonOf(const Json::exception& error) {
+        std::string_view text = error.what();
+        if (const std::size_t at = text.find("] "); at != std::string_view::npos) text.remove_prefix(at + 2);
+        if (text.starts_with("parse error")) text.remove_prefix(text.find(": ") + 2);
+        return std::string(text.substr(0, text.find("; last read")));
+    }
+
+    const std::string& file_;
+    std::string_view text_;
+    std::vector<Level> levels_;
+};
 
 } // namespace
 
 Description readJsonDescription(const std::string& file, const std::string& text) {
-    const Json json = parse(file, text);
+    Checker checker(file, text);
+    Json::sax_parse(text, &checker);
+    const Json json = Json::parse(text);
     const Node document(json, file, "");
     const Node types = document.asObject({"$schema", "types"}).at("types");
     if (document.has("$schema")) document.at("$schema").asText();
     Description description;
     const std::size_t numTypes = types.numItems();
     description.types.reserve(numTypes);
-    for (std::size_t i = 0; i < numTypes; ++i) description.types.push_back(readType(types.item(i)));
+    for (std::size_t i = 0; i < numTypes; ++i)
+        description.types.push_back(readType(types.item(i)));
     return description;
 }
 

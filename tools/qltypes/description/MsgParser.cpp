@@ -56,7 +56,8 @@ class LineReader {
     [[noreturn]] void complain(const std::string& complaint) const { throw InputError(place(), complaint); }
 
     void skipBlanks() {
-        while (position_ < text_.size() && (text_[position_] == ' ' || text_[position_] == '\t')) ++position_;
+        while (position_ < text_.size() && (text_[position_] == ' ' || text_[position_] == '\t'))
+            ++position_;
     }
 
     /// Whether nothing but a comment is left.
@@ -71,7 +72,8 @@ class LineReader {
     /// A letter, then letters, digits and underscores.
     std::string word(const char* what) {
         const std::size_t start = position_;
-        while (position_ < text_.size() && isWordCharacter(text_[position_], position_ == start)) ++position_;
+        while (position_ < text_.size() && isWordCharacter(text_[position_], position_ == start))
+            ++position_;
         if (position_ == start) complain(fmt::format("expected {}", what));
         return std::string(text_.substr(start, position_ - start));
     }

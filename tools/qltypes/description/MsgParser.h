@@ -1,6 +1,7 @@
 // The text of one robot message definition.
 //
-// A field is "type name"; a type is a basic type, a message of the same package, "package/Message", or one of these with
+// A field is "type name"; a type is a basic type, a message of the same package, "package/Message", or one of these
+// with
 // "[N]" (N elements) or "[]" (any number) behind it. "type NAME=value" is a constant and skipped, "#" begins a comment.
 #pragma once
 

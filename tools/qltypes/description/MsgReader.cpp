@@ -38,10 +38,14 @@ TypeDescription pairOfIntegers(const std::string& name, const char* integer) {
 std::string reasonOf(RefusalKind kind, const MessageField& field) {
     const std::string& name = field.element.name;
     switch (kind) {
-    case RefusalKind::Text: return fmt::format("field '{}' is text", name);
-    case RefusalKind::VariableLength: return fmt::format("field '{}' is an array of any length", name);
-    case RefusalKind::UsesRefused: return fmt::format("field '{}' is {}, which is refused", name, field.message);
-    case RefusalKind::NoFields: break;
+    case RefusalKind::Text:
+        return fmt::format("field '{}' is text", name);
+    case RefusalKind::VariableLength:
+        return fmt::format("field '{}' is an array of any length", name);
+    case RefusalKind::UsesRefused:
+        return fmt::format("field '{}' is {}, which is refused", name, field.message);
+    case RefusalKind::NoFields:
+        break;
     }
     return "it has no fields";
 }
@@ -75,7 +79,8 @@ void MsgReader::addFolder(const fs::path& folder) {
     if (error) throw InputError({folder.string(), ""}, "cannot be read: " + error.message());
     if (files.empty()) throw InputError({folder.string(), ""}, "the folder has no .msg files");
     std::sort(files.begin(), files.end());
-    for (const fs::path& file : files) addFile(file);
+    for (const fs::path& file : files)
+        addFile(file);
 }
 
 fs::path MsgReader::find(const MessageField& field, const Message& from) const {
@@ -113,7 +118,8 @@ void MsgReader::refuse() {
         }
     }
     for (std::size_t i = 0; i < refused.size(); ++i) { // grows while it is walked
-        for (const auto& [user, field] : uses[refused[i]]) refuseFor(user, RefusalKind::UsesRefused, field);
+        for (const auto& [user, field] : uses[refused[i]])
+            refuseFor(user, RefusalKind::UsesRefused, field);
     }
 }
 
@@ -123,15 +129,16 @@ void MsgReader::describe(Message& message, Description& description) const {
         return;
     }
     StructureDescription structure;
-    for (MessageField& field : message.fields) structure.elements.push_back(std::move(field.element));
-    description.types.push_back({registeredMessageName(message.label), message.label,
-                                 Place{message.file.string(), ""}, std::move(structure)});
+    for (MessageField& field : message.fields)
+        structure.elements.push_back(std::move(field.element));
+    description.types.push_back(
+        {registeredMessageName(message.label), message.label, Place{message.file.string(), ""}, std::move(structure)});
 }
 
 Description MsgReader::read() {
     for (std::size_t i = 0; i < messages_.size(); ++i) { // grows while it is walked: nothing recurses on the depth
-        std::vector<MessageField> fields = parseMessage(
-            messages_[i].file.string(), packageOf(messages_[i].label), readFileText(messages_[i].file));
+        std::vector<MessageField> fields =
+            parseMessage(messages_[i].file.string(), packageOf(messages_[i].label), readFileText(messages_[i].file));
         for (const MessageField& field : fields) {
             if (!field.message.empty() && !indexByLabel_.count(field.message))
                 add(field.message, find(field, messages_[i]));
@@ -142,7 +149,8 @@ Description MsgReader::read() {
 
     Description description;
     description.numMessages = messages_.size();
-    for (Message& message : messages_) describe(message, description);
+    for (Message& message : messages_)
+        describe(message, description);
     for (const auto& [name, integer] : {std::pair("time", "uint32"), std::pair("duration", "int32")}) {
         const bool isUsed = std::any_of(description.types.begin(), description.types.end(), [&](const auto& type) {
             const auto& elements = std::get<StructureDescription>(type.kind).elements;

@@ -15,7 +15,8 @@ std::vector<const TypeReference*> referencesOf(const TypeDescription& type) {
     std::vector<const TypeReference*> references;
     if (const auto* alias = std::get_if<AliasDescription>(&type.kind)) references.push_back(&alias->target);
     if (const auto* structure = std::get_if<StructureDescription>(&type.kind)) {
-        for (const ElementDescription& element : structure->elements) references.push_back(&element.type);
+        for (const ElementDescription& element : structure->elements)
+            references.push_back(&element.type);
     }
     return references;
 }
@@ -46,7 +47,8 @@ class Walk {
         for (std::size_t i = 0; i < types_.size(); ++i) {
             if (states_[i] != State::New) continue;
             open(i);
-            while (!stack_.empty()) step();
+            while (!stack_.empty())
+                step();
         }
         return std::move(order_);
     }

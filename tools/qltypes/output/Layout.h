@@ -41,7 +41,7 @@ struct StructureLayout {
 /// A type that is no structure and not built in.
 struct OtherType {
     std::string name;
-    std::string kind; ///< "alias", "number" or "client"
+    std::string kind;   ///< "alias", "number" or "client"
     std::string target; ///< the label of what an alias stands for
     std::int64_t size = 0;
 };

@@ -11,10 +11,14 @@ using Json = nlohmann::ordered_json;
 
 const char* keyOf(RefusalKind kind) {
     switch (kind) {
-    case RefusalKind::Text: return "text";
-    case RefusalKind::VariableLength: return "variable-length";
-    case RefusalKind::NoFields: return "no-fields";
-    case RefusalKind::UsesRefused: break;
+    case RefusalKind::Text:
+        return "text";
+    case RefusalKind::VariableLength:
+        return "variable-length";
+    case RefusalKind::NoFields:
+        return "no-fields";
+    case RefusalKind::UsesRefused:
+        break;
     }
     return "uses-refused";
 }
@@ -39,16 +43,16 @@ Json elementJson(const ElementLayout& element) {
         {"moved", nullptr},
     };
     if (element.move) {
-        json["moved"] = {{"from", element.move->from},
-                         {"alignment", element.move->alignment},
-                         {"reason", element.move->reason}};
+        json["moved"] = {
+            {"from", element.move->from}, {"alignment", element.move->alignment}, {"reason", element.move->reason}};
     }
     return json;
 }
 
 Json structureJson(const StructureLayout& structure) {
     Json elements = Json::array();
-    for (const ElementLayout& element : structure.elements) elements.push_back(elementJson(element));
+    for (const ElementLayout& element : structure.elements)
+        elements.push_back(elementJson(element));
     return {
         {"name", structure.name},
         {"label", structure.label},
@@ -76,7 +80,8 @@ Json refusalJson(const Refusal& refusal) {
 
 template <class Item, class Convert> Json arrayOf(const std::vector<Item>& items, Convert convert) {
     Json json = Json::array();
-    for (const Item& item : items) json.push_back(convert(item));
+    for (const Item& item : items)
+        json.push_back(convert(item));
     return json;
 }
 

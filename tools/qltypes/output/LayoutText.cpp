@@ -13,7 +13,8 @@ namespace {
 std::string nameWithDimensions(const ElementDescription& element) {
     std::string text = element.name;
     if (element.dimensions == std::vector<std::int64_t>{1}) return text;
-    for (const std::int64_t dimension : element.dimensions) text += fmt::format("[{}]", dimension);
+    for (const std::int64_t dimension : element.dimensions)
+        text += fmt::format("[{}]", dimension);
     return text;
 }
 
@@ -30,7 +31,10 @@ std::string notesOf(const ElementLayout& element) {
 }
 
 std::string structureText(const StructureLayout& structure, const Colours& colours) {
-    TextTable table({{"offset", Align::Right}, {"size", Align::Right}, {"element", Align::Left}, {"type", Align::Left},
+    TextTable table({{"offset", Align::Right},
+                     {"size", Align::Right},
+                     {"element", Align::Left},
+                     {"type", Align::Left},
                      {"notes", Align::Left}});
     const auto number = [](std::int64_t value) { return std::to_string(value); };
     for (const ElementLayout& element : structure.elements) {
@@ -43,22 +47,24 @@ std::string structureText(const StructureLayout& structure, const Colours& colou
                       isLast ? "size rounded up to a multiple of 8" : ""},
                      true);
     }
-    return fmt::format("{}\n{}  {} bytes, {} of them padding; elements: {} immediate, {} flat, {} raw, {} depth-first\n\n",
-                       colours.bold(structure.label), table.text("  ", colours), structure.size, structure.padding,
-                       structure.elements.size(), structure.numFlatElements, structure.numRawElements,
-                       structure.numDFSElements);
+    return fmt::format(
+        "{}\n{}  {} bytes, {} of them padding; elements: {} immediate, {} flat, {} raw, {} depth-first\n\n",
+        colours.bold(structure.label), table.text("  ", colours), structure.size, structure.padding,
+        structure.elements.size(), structure.numFlatElements, structure.numRawElements, structure.numDFSElements);
 }
 
 std::string otherTypesText(const std::vector<OtherType>& types, const Colours& colours) {
     TextTable table({{"type", Align::Left}, {"size", Align::Right}, {"kind", Align::Left}});
     for (const OtherType& type : types)
-        table.addRow({type.name, std::to_string(type.size), type.kind == "alias" ? "alias of " + type.target : type.kind});
+        table.addRow(
+            {type.name, std::to_string(type.size), type.kind == "alias" ? "alias of " + type.target : type.kind});
     return fmt::format("{}\n{}\n", colours.bold("Types that are no structures"), table.text("  ", colours));
 }
 
 std::string refusalsText(const std::vector<Refusal>& refusals, const Colours& colours) {
     TextTable table({{"message", Align::Left}, {"why", Align::Left}});
-    for (const Refusal& refusal : refusals) table.addRow({refusal.label, refusal.reason});
+    for (const Refusal& refusal : refusals)
+        table.addRow({refusal.label, refusal.reason});
     return fmt::format("{}\n{}\n", colours.bold("Messages that cannot be expressed"), table.text("  ", colours));
 }
 
@@ -89,7 +95,8 @@ std::string summaryText(const Layout& layout) {
 std::string layoutText(const Layout& layout, bool isSelection, const Colours& colours) {
     std::string text;
     if (!isSelection && !layout.otherTypes.empty()) text += otherTypesText(layout.otherTypes, colours);
-    for (const StructureLayout& structure : layout.structures) text += structureText(structure, colours);
+    for (const StructureLayout& structure : layout.structures)
+        text += structureText(structure, colours);
     if (!isSelection && !layout.refusals.empty()) text += refusalsText(layout.refusals, colours);
     return text + summaryText(layout);
 }

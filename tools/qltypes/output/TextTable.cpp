@@ -18,9 +18,7 @@ std::string Colours::wrapped(std::string_view code, std::string_view text) const
     return std::string(code).append(text).append("\x1b[0m");
 }
 
-void TextTable::addRow(std::vector<std::string> cells, bool isDimmed) {
-    rows_.push_back({std::move(cells), isDimmed});
-}
+void TextTable::addRow(std::vector<std::string> cells, bool isDimmed) { rows_.push_back({std::move(cells), isDimmed}); }
 
 std::string TextTable::line(const std::vector<std::string>& cells, const std::vector<std::size_t>& widths) const {
     std::string line;
@@ -37,7 +35,8 @@ std::string TextTable::line(const std::vector<std::string>& cells, const std::ve
 std::string TextTable::text(std::string_view indent, const Colours& colours) const {
     std::vector<std::size_t> widths(columns_.size(), 0);
     for (const Row& row : rows_) {
-        for (std::size_t i = 0; i < widths.size(); ++i) widths[i] = std::max(widths[i], widthOf(row.cells[i]));
+        for (std::size_t i = 0; i < widths.size(); ++i)
+            widths[i] = std::max(widths[i], widthOf(row.cells[i]));
     }
     std::vector<std::string> titles;
     for (std::size_t i = 0; i < widths.size(); ++i) {
