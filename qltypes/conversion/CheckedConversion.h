@@ -9,6 +9,7 @@
 
 #include "qlplatform/Export.h"
 #include "qltypes/fixed_point/FixPointDefs.h"
+#include "qltypes/types/FunctionTypes.h"
 
 /// Looks up the conversion and runs it. Layouts, broadcast and result are those of BuiltInConvFcn: false when `check`
 /// is set and something was lost.
@@ -17,3 +18,9 @@ QL_EXPORT bool qlConvertBuiltInDTypeVectWithCheck(const void* src, unsigned long
                                                   void* dst, unsigned long dstCount, int dstId, bool dstComplex,
                                                   fxpModeOverflow_tag overflow, fxpModeRounding_tag rounding,
                                                   bool check);
+
+/// The conversion function of auto, which counts as double, and of the built-in types: saturates and truncates toward
+/// zero. Always returns 1; caller and auxiliary data are ignored.
+/// Unchecked: both identifiers must lead to a built-in type or auto.
+QL_EXPORT int qlBuiltInConvertBetween(_qlDataTypeAccess_tag* access, const char* caller, int dstId, int srcId,
+                                      int count, const void* src, const void* aux, void* dst);

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <type_traits>
 
+#include "qltypes/conversion/CheckedConversion.h"
 #include "qltypes/host/Assert_internal.h"
 
 namespace QLTypeSys {
@@ -64,7 +65,7 @@ template <class T> constexpr FixedType builtIn(const char* name, BuiltInDTypeId 
             isSigned,
             dtSourceBuiltIn,
             DATA_TYPE_ID_INVALID,
-            nullptr,
+            qlBuiltInConvertBetween,
             C::isPositive,
             C::isNegative,
             C::greaterThan,

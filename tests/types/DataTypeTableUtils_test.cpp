@@ -79,12 +79,12 @@ TEST_F(FlatTest, SettersReadsAndHasByStem) {
     EXPECT_RAISES(DtGet##stem##Fcn ARGS(99), invalidId, 99);
 #define RESOLVED(typeId) (&table, typeId)
 #define WITH_CALLER(typeId) (&table, "caller", typeId)
-#define PLAIN(stem)                                                                                               \
+#define PLAIN(stem)                                                                                                    \
     EXPECT_EQ(DtSet##stem##Fcn(&table, plain, functionAt<stem##Fcn>(8)), nullptr);                                     \
     EXPECT_EQ(DtSet##stem##FcnName(&table, plain, #stem), nullptr);                                                    \
     EXPECT_EQ(record->get##stem##Fcn(), functionAt<stem##Fcn>(8));                                                     \
     EXPECT_EQ(record->get##stem##FcnName(), #stem);                                                                    \
-    READ(stem, RESOLVED)                                                                                                         \
+    READ(stem, RESOLVED)                                                                                               \
     expectDiagnostic(DtSet##stem##Fcn(&table, alias, nullptr),                                                         \
                      testsupport::raisedBy([&] { aliasRecord->set##stem##Fcn(nullptr); }));                            \
     expectDiagnostic(DtSet##stem##FcnName(&table, alias, ""),                                                          \
@@ -93,15 +93,16 @@ TEST_F(FlatTest, SettersReadsAndHasByStem) {
     EXPECT_FALSE(DtHasSerializeFcn(&table, alias));
     PLAIN(Serialize) NAME(Serialize) EXPECT_TRUE(DtHasSerializeFcn(&table, alias));
     PLAIN(Deserialize)
-        NAME(Deserialize) PLAIN(SerializeSize) NAME(SerializeSize) PLAIN(SizeOf) NAME(SizeOf) PLAIN(ContainedData)
-            NAME(ContainedData) PLAIN(ContainedDataDims) NAME(ContainedDataDims) PLAIN(UpdateContainedDataDims)
+    NAME(Deserialize)
+        PLAIN(SerializeSize) NAME(SerializeSize) PLAIN(SizeOf) NAME(SizeOf) PLAIN(ContainedData) NAME(ContainedData)
+            PLAIN(ContainedDataDims) NAME(ContainedDataDims) PLAIN(UpdateContainedDataDims)
                 NAME(UpdateContainedDataDims) PLAIN(UpdateContainedDataDim) PLAIN(CoderProperties) NAME(CoderProperties)
                     PLAIN(DataConstruct) NAME(DataConstruct)
                         EXPECT_EQ(aliasRecord->getUpdateContainedDataDimsFcn(), nullptr)
         << "which the flat function gets right";
 #define BLOCK(stem)                                                                                                    \
     EXPECT_EQ(DtSet##stem##Fcn(&table, "block", plain, functionAt<stem##Fcn>(8)), nullptr);                            \
-    READ(stem, WITH_CALLER)                                                                                             \
+    READ(stem, WITH_CALLER)                                                                                            \
     expectDiagnostic(DtSet##stem##Fcn(&table, "", alias, nullptr),                                                     \
                      "QuillaneTypes:general:CannotSetPropertyOfAliasType('" #stem "', 'Second')");                     \
     expectDiagnostic(DtSet##stem##Fcn(&table, "model/Gain", alias, nullptr),                                           \

