@@ -1,0 +1,69 @@
+#include "qltypes/structures/StructElement.h"
+
+#include <algorithm>
+#include <vector>
+
+#include "qltypes/structures/Arithmetic_internal.h"
+
+using QLTypeSys::structures::narrowed;
+using QLTypeSys::structures::wrappingMultiply;
+
+namespace {
+
+constexpr double largest = std::numeric_limits<double>::max();
+constexpr double infinity = std::numeric_limits<double>::infinity();
+
+} // namespace
+
+StructElement::~StructElement() {
+    if (numDims > 1) delete[] dims;
+    delete[] intDims;
+}
+
+void StructElement::setName(const char* elementName) { name = elementName ? elementName : ""; }
+
+void StructElement::setNumDimensions(long count) {
+    const auto newCount = count < 1 ? 0ul : static_cast<unsigned long>(count);
+    if (newCount == numDims) return;
+    long* const newDims = newCount > 1 ? new long[newCount]() : nullptr;
+    if (newDims) {
+        std::copy_n(dims, std::min(numDims, newCount), newDims);
+    } else if (newCount == 1) {
+        inlineDim = numDims > 0 ? dims[0] : 0;
+    }
+    if (numDims > 1) delete[] dims;
+    delete[] intDims;
+    intDims = nullptr;
+    numDims = newCount;
+    dims = newCount == 1 ? &inlineDim : newDims;
+}
+
+void StructElement::setDimension(long index, long value) {
+    dims[index] = value;
+    if (intDims) intDims[index] = narrowed(value);
+}
+
+const int* StructElement::getDimensionsAsInt(const ObsoleteIntDimsKey&) {
+    if (!intDims && numDims > 0) {
+        intDims = new int[numDims];
+        std::transform(dims, dims + numDims, intDims, narrowed);
+    }
+    return intDims;
+}
+
+long StructElement::getWidth() const {
+    long width = 1;
+    for (int i = 0; i < static_cast<int>(numDims); ++i)
+        width = wrappingMultiply(width, dims[i]);
+    return width;
+}
+
+bool StructElement::isScalar() const {
+    return static_cast<int>(numDims) < 1 || std::all_of(dims, dims + numDims, [](long dim) { return dim == 1; });
+}
+
+// Written as the negation of a failed comparison: NaN passes both.
+bool StructElement::getMinSpec() const { return !(-largest > min); }
+bool StructElement::getMaxSpec() const { return !(max > largest); }
+double StructElement::getMin() const { return getMinSpec() ? min : -infinity; }
+double StructElement::getMax() const { return getMaxSpec() ? max : infinity; }

@@ -1,0 +1,147 @@
+#include "qltypes/structures/StructLayout.h"
+
+#include <algorithm>
+#include <cstring>
+#include <limits>
+
+#include "qltypes/host/Failure_internal.h"
+#include "qltypes/structures/Arithmetic_internal.h"
+#include "qltypes/structures/StructDataType.h"
+#include "qltypes/structures/StructDataTypeUtils.h"
+#include "qltypes/types/DataTypeTable.h"
+#include "qltypes/types/DataTypeTableUtils.h"
+
+using QLTypeSys::DataType;
+using QLTypeSys::DataTypeTable;
+using namespace QLTypeSys::structures;
+namespace failure = QLTypeSys::failure;
+
+namespace {
+
+constexpr unsigned long largestSize = 0x7fffffff;
+
+unsigned long roundedUp(unsigned long offset, unsigned long powerOfTwo) {
+    return (offset + powerOfTwo - 1) & ~(powerOfTwo - 1);
+}
+
+// What the pass needs of an element's type.
+struct ElementType {
+    const DataType* entry;        // as the table has it; its size and ground count
+    const DataType* resolved;     // at the end of the alias chain
+    const StructDataType* nested; // null for a leaf
+
+    ElementType(const DataTypeTable* table, int id)
+        : entry(table->getDataTypeAt(static_cast<unsigned long>(id + 1))),
+          resolved(table->getDataTypeAliasedThruTo(id)),
+          nested(id != DATA_TYPE_ID_AUTO && resolved->getIsType(QLTypeSys::dtqStruct)
+                     ? static_cast<const StructDataType*>(resolved)
+                     : nullptr) {}
+
+    unsigned long aligned(unsigned long offset) const {
+        const int size = entry->getSize();
+        if (CheckForBuiltInDataType(entry->getIdAliasedThruTo())) {
+            bool overflow;
+            return DtCorrectOffsetForProperAlignment(offset, static_cast<unsigned long>(size), &overflow);
+        }
+        return roundedUp(offset, size > 7 ? 8 : size > 3 ? 4 : size > 1 ? 2 : 1);
+    }
+};
+
+long complexWidth(const StructElement& element) {
+    const long width = element.getWidth();
+    return element.signalType == 1 ? wrappingMultiply(width, 2) : width;
+}
+
+} // namespace
+
+// One run over one structure.
+struct StructLayoutPass {
+    const DataTypeTable* table;
+    int id; // as the caller named it
+    StructDataType& record;
+    unsigned long offset = 0; // of the next byte
+    long numFlat = 0;
+    long numRaw = 0;
+    long numDFS = 1; // the root
+    bool groundHasNonZero = false;
+
+    qlsvDiagnosticImpl* run();
+    bool place(StructElement& element, bool isLast);
+    void buildGround();
+};
+
+// False when the structure grew beyond the limit.
+bool StructLayoutPass::place(StructElement& element, bool isLast) {
+    const ElementType type(table, element.dataTypeId);
+    if (!groundHasNonZero) groundHasNonZero = type.resolved->groundHasNonZeroStoredValue();
+    offset = type.aligned(offset);
+    element.setOffset(static_cast<long>(offset));
+    const long width = complexWidth(element);
+    offset += static_cast<unsigned long>(type.entry->getSize()) * static_cast<unsigned long>(width);
+    if (type.nested) { // kept: a nested structure whose element says complex counts twice
+        numRaw = wrappingAdd(numRaw, wrappingMultiply(width, type.nested->getNumRawElements()));
+        numFlat = wrappingAdd(numFlat, wrappingMultiply(width, type.nested->getNumFlatElements()));
+        numDFS = wrappingAdd(numDFS, wrappingMultiply(width, type.nested->getNumDFSElements()) + (width > 1 ? 1 : 0));
+    } else {
+        numFlat = wrappingAdd(numFlat, 1);
+        numRaw = wrappingAdd(numRaw, width);
+        numDFS = wrappingAdd(numDFS, 1);
+    }
+    if (isLast) offset = roundedUp(offset, 8);
+    return offset <= largestSize;
+}
+
+// Writes each element's ground, side by side as often as it is wide. Padding stays as it is.
+void StructLayoutPass::buildGround() {
+    for (const StructElement* element : record.elements_) {
+        const DataType* const type = table->getDataTypeAt(static_cast<unsigned long>(element->dataTypeId + 1));
+        const void* const ground = type->getGround();
+        const long size = type->getSize();
+        const long room = record.size_ - element->offset; // widths below 0 let elements lie past the end
+        const long bytes = std::min(wrappingMultiply(size, complexWidth(*element)), room);
+        if (!ground || bytes < size || size <= 0) continue;
+        unsigned char* const first = record.ground_ + element->offset;
+        std::memcpy(first, ground, static_cast<std::size_t>(size));
+        for (long done = size; done < bytes;) { // what is written doubles with each step
+            const long step = std::min(done, bytes - done);
+            std::memcpy(first + done, first, static_cast<std::size_t>(step));
+            done += step;
+        }
+    }
+}
+
+qlsvDiagnosticImpl* StructLayoutPass::run() {
+    record.createCacheForFrequentlyAccessedProperties(table);
+    const std::vector<StructElement*>& elements = record.getElements();
+    if (elements.empty()) return nullptr;
+    for (StructElement* element : elements) {
+        if (!place(*element, element == elements.back()))
+            return failure::diagnosticOf(failure::message("Quillane:General", "InvalidDataTypeSizeInDataTypeTable",
+                                                          largestSize, DtGetDataTypeName(table, id)));
+    }
+    record.setNumFlatElements(numFlat);
+    record.setNumRawElements(numRaw);
+    record.setNumDFSElements(numDFS);
+    record.setSize(static_cast<int>(offset));
+    record.setGroundHasNonZeroStoredValue(groundHasNonZero);
+    buildGround();
+    return nullptr;
+}
+
+qlsvDiagnosticImpl* DtComputeDerivedStructAttributes(DataTypeTable* table, int id) {
+    qlsvDiagnosticImpl* tooLarge = nullptr;
+    qlsvDiagnosticImpl* raised = failure::diagnosticFrom([&] {
+        tooLarge = StructLayoutPass{table, id, *DtGetStructDataTypeObject_AliasedThruIfNeeded(table, id)}.run();
+    });
+    return raised ? raised : tooLarge;
+}
+
+unsigned long DtCorrectOffsetForProperAlignment(unsigned long offset, unsigned long size, bool* overflow) {
+    if (size != 0 && size % 2 == 0) {
+        const unsigned long toEight = -offset % 8;
+        const unsigned long toSize = (size - offset % size) % size;
+        offset += std::min(toEight, toSize);
+    }
+    if (overflow) *overflow = offset > largestSize;
+    return offset;
+}
