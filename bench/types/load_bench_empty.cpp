@@ -1,0 +1,1 @@
+// A library with the dependencies of libqltypes and nothing in it.
