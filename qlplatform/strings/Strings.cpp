@@ -19,8 +19,17 @@ constexpr std::array<std::string_view, 44> cKeywords = {
     "static",    "struct",         "switch",        "typedef", "union",    "unsigned", "void",
     "volatile",  "while"};
 
-bool isLetter(char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_'; }
-bool isDigit(char c) { return c >= '0' && c <= '9'; }
+// What may stand in an identifier: 1 anywhere, 2 behind the first character.
+constexpr auto identifierClass = [] {
+    std::array<std::uint8_t, 256> table{};
+    for (int c = 0; c < 256; ++c) {
+        const bool isLetter = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_';
+        table[static_cast<std::size_t>(c)] = isLetter ? 1 : c >= '0' && c <= '9' ? 2 : 0;
+    }
+    return table;
+}();
+
+std::uint8_t classOf(char c) { return identifierClass[static_cast<unsigned char>(c)]; }
 
 template <class To, class From> std::basic_string<To> converted(std::basic_string_view<From> text) {
     namespace utf = boost::locale::utf;
@@ -53,8 +62,11 @@ std::u16string qlsvUtf16FromUtf8(std::string_view text) { return converted<char1
 std::u16string scl::string::cvt_string(std::string_view text) { return qlsvUtf16FromUtf8(text); }
 
 bool qlIsValidANSICIdentifier(const char* name, bool allowKeywords) {
-    if (!name || !isLetter(*name)) return false;
-    const std::string_view text = name;
-    if (!std::all_of(text.begin(), text.end(), [](char c) { return isLetter(c) || isDigit(c); })) return false;
-    return allowKeywords || !std::binary_search(cKeywords.begin(), cKeywords.end(), text);
+    if (!name || classOf(*name) != 1) return false;
+    const char* end = name;
+    while (classOf(*end) != 0)
+        ++end;
+    if (*end) return false;
+    return allowKeywords || !std::binary_search(cKeywords.begin(), cKeywords.end(),
+                                                std::string_view(name, static_cast<std::size_t>(end - name)));
 }

@@ -17,12 +17,17 @@ namespace {
 
 constexpr const char* general = "QuillaneTypes:general";
 
+const std::string& textOf(const LazyText& text) {
+    static const std::string empty;
+    return text.isSet() ? *text : empty;
+}
+
 bool isOneOf(int id, int low, int high) { return id >= low && id <= high; }
 
 } // namespace
 
 DataType::DataType(int id, const std::string& name, DataTypeSource source)
-    : id_(id), name_(name), shortName_(name), source_(source), storageId_(id) {}
+    : id_(id), name_(name), source_(source), storageId_(id) {}
 
 DataType::~DataType() {
     // The field and not the virtual getter: a subclass's part is gone already.
@@ -41,7 +46,7 @@ void DataType::refuseOnAlias(const char* property) const {
 }
 
 // Replaceable: the last value stands.
-template <class F> void DataType::define(const char* property, F& field, const F& value) {
+template <class F, class Value> void DataType::define(const char* property, F& field, const Value& value) {
     refuseOnAlias(property);
     field = value;
     setAliasedToLocked(true);
@@ -112,31 +117,31 @@ void DataType::setTargetToHostFcn(TargetToHostFcn f) { defineOnceForTarget(targe
 // --- Plain reads -----------------------------------------------------------------------------------------------------
 
 ConstructFcn DataType::getConstructFcn() const { return constructFcn_; }
-const std::string& DataType::getConstructFcnName() const { return constructFcnName_; }
+const std::string& DataType::getConstructFcnName() const { return textOf(constructFcnName_); }
 DestructFcn DataType::getDestructFcn() const { return destructFcn_; }
-const std::string& DataType::getDestructFcnName() const { return destructFcnName_; }
+const std::string& DataType::getDestructFcnName() const { return textOf(destructFcnName_); }
 DeepCopyFcn DataType::getDeepCopyFcn() const { return deepCopyFcn_; }
-const std::string& DataType::getDeepCopyFcnName() const { return deepCopyFcnName_; }
+const std::string& DataType::getDeepCopyFcnName() const { return textOf(deepCopyFcnName_); }
 SerializeFcn DataType::getSerializeFcn() const { return serializeFcn_; }
-const std::string& DataType::getSerializeFcnName() const { return serializeFcnName_; }
+const std::string& DataType::getSerializeFcnName() const { return textOf(serializeFcnName_); }
 DeserializeFcn DataType::getDeserializeFcn() const { return deserializeFcn_; }
-const std::string& DataType::getDeserializeFcnName() const { return deserializeFcnName_; }
+const std::string& DataType::getDeserializeFcnName() const { return textOf(deserializeFcnName_); }
 SerializeSizeFcn DataType::getSerializeSizeFcn() const { return serializeSizeFcn_; }
-const std::string& DataType::getSerializeSizeFcnName() const { return serializeSizeFcnName_; }
+const std::string& DataType::getSerializeSizeFcnName() const { return textOf(serializeSizeFcnName_); }
 SizeOfFcn DataType::getSizeOfFcn() const { return sizeOfFcn_; }
-const std::string& DataType::getSizeOfFcnName() const { return sizeOfFcnName_; }
+const std::string& DataType::getSizeOfFcnName() const { return textOf(sizeOfFcnName_); }
 ContainedDataFcn DataType::getContainedDataFcn() const { return containedDataFcn_; }
-const std::string& DataType::getContainedDataFcnName() const { return containedDataFcnName_; }
+const std::string& DataType::getContainedDataFcnName() const { return textOf(containedDataFcnName_); }
 ContainedDataDimsFcn DataType::getContainedDataDimsFcn() const { return containedDataDimsFcn_; }
-const std::string& DataType::getContainedDataDimsFcnName() const { return containedDataDimsFcnName_; }
+const std::string& DataType::getContainedDataDimsFcnName() const { return textOf(containedDataDimsFcnName_); }
 UpdateContainedDataDimsFcn DataType::getUpdateContainedDataDimsFcn() const { return updateContainedDataDimsFcn_; }
-const std::string& DataType::getUpdateContainedDataDimsFcnName() const { return updateContainedDataDimsFcnName_; }
+const std::string& DataType::getUpdateContainedDataDimsFcnName() const { return textOf(updateContainedDataDimsFcnName_); }
 UpdateContainedDataDimFcn DataType::getUpdateContainedDataDimFcn() const { return updateContainedDataDimFcn_; }
-const std::string& DataType::getUpdateContainedDataDimFcnName() const { return updateContainedDataDimFcnName_; }
+const std::string& DataType::getUpdateContainedDataDimFcnName() const { return textOf(updateContainedDataDimFcnName_); }
 CoderPropertiesFcn DataType::getCoderPropertiesFcn() const { return coderPropertiesFcn_; }
-const std::string& DataType::getCoderPropertiesFcnName() const { return coderPropertiesFcnName_; }
+const std::string& DataType::getCoderPropertiesFcnName() const { return textOf(coderPropertiesFcnName_); }
 DataConstructFcn DataType::getDataConstructFcn() const { return dataConstructFcn_; }
-const std::string& DataType::getDataConstructFcnName() const { return dataConstructFcnName_; }
+const std::string& DataType::getDataConstructFcnName() const { return textOf(dataConstructFcnName_); }
 ConvertBetweenFcn DataType::getConvertBetweenFcn() const { return convertBetweenFcn_; }
 IsPositiveFcn DataType::getIsPositiveFcn() const { return isPositiveFcn_; }
 IsNegativeFcn DataType::getIsNegativeFcn() const { return isNegativeFcn_; }
@@ -146,7 +151,7 @@ HostToTargetFcn DataType::getHostToTargetFcn() const { return hostToTargetFcn_; 
 TargetToHostFcn DataType::getTargetToHostFcn() const { return targetToHostFcn_; }
 int DataType::getId() const { return id_; }
 const char* DataType::getName() const { return name_.c_str(); }
-const char* DataType::getShortName() const { return shortName_.c_str(); }
+const char* DataType::getShortName() const { return shortName_.isSet() ? (*shortName_).c_str() : name_.c_str(); }
 bool DataType::getIsValidFixptType() const { return isValidFixptType_; }
 DataTypeSource DataType::getDataTypeSource() const { return source_; }
 bool DataType::getAliasedToLocked() const { return aliasedToLocked_; }

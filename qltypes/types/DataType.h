@@ -17,6 +17,7 @@
 
 #include "qlplatform/Export.h"
 #include "qltypes/types/FunctionTypes.h"
+#include "qltypes/types/LazyText.h"
 #include "qltypes/types/TypeIds.h"
 
 struct txArray_tag;
@@ -285,7 +286,7 @@ class QL_EXPORT DataType {
 
     int id_;
     std::string name_;
-    std::string shortName_;
+    LazyText shortName_; // not set: the same as the name
     DataTypeSource source_;
     int size_ = -1;
     bool isAtomic_ = false;
@@ -307,33 +308,33 @@ class QL_EXPORT DataType {
     txArray_tag* interface_ = nullptr; // one reference held
     ConvertBetweenFcn convertBetweenFcn_ = nullptr;
     ConstructFcn constructFcn_ = nullptr;
-    std::string constructFcnName_;
+    LazyText constructFcnName_;
     DestructFcn destructFcn_ = nullptr;
-    std::string destructFcnName_;
+    LazyText destructFcnName_;
     DeepCopyFcn deepCopyFcn_ = nullptr;
-    std::string deepCopyFcnName_;
+    LazyText deepCopyFcnName_;
     SerializeFcn serializeFcn_ = nullptr;
-    std::string serializeFcnName_;
+    LazyText serializeFcnName_;
     DeserializeFcn deserializeFcn_ = nullptr;
-    std::string deserializeFcnName_;
+    LazyText deserializeFcnName_;
     SerializeSizeFcn serializeSizeFcn_ = nullptr;
-    std::string serializeSizeFcnName_;
+    LazyText serializeSizeFcnName_;
     SizeOfFcn sizeOfFcn_ = nullptr;
-    std::string sizeOfFcnName_;
+    LazyText sizeOfFcnName_;
     ContainedDataFcn containedDataFcn_ = nullptr;
-    std::string containedDataFcnName_;
+    LazyText containedDataFcnName_;
     int containedDataType_ = DATA_TYPE_ID_INVALID;
     unsigned long containedDataNumDims_ = 0;
     ContainedDataDimsFcn containedDataDimsFcn_ = nullptr;
-    std::string containedDataDimsFcnName_;
+    LazyText containedDataDimsFcnName_;
     UpdateContainedDataDimsFcn updateContainedDataDimsFcn_ = nullptr;
-    std::string updateContainedDataDimsFcnName_;
+    LazyText updateContainedDataDimsFcnName_;
     UpdateContainedDataDimFcn updateContainedDataDimFcn_ = nullptr;
-    std::string updateContainedDataDimFcnName_;
+    LazyText updateContainedDataDimFcnName_;
     CoderPropertiesFcn coderPropertiesFcn_ = nullptr;
-    std::string coderPropertiesFcnName_;
+    LazyText coderPropertiesFcnName_;
     DataConstructFcn dataConstructFcn_ = nullptr;
-    std::string dataConstructFcnName_;
+    LazyText dataConstructFcnName_;
     IsPositiveFcn isPositiveFcn_ = nullptr;
     IsNegativeFcn isNegativeFcn_ = nullptr;
     GreaterThanFcn greaterThanFcn_ = nullptr;
@@ -349,7 +350,7 @@ class QL_EXPORT DataType {
 
   private:
     void refuseOnAlias(const char* property) const;
-    template <class F> void define(const char* property, F& field, const F& value);
+    template <class F, class Value> void define(const char* property, F& field, const Value& value);
     template <class F> void defineCustom(const char* property, F& field, F value, bool& plainFlag);
     template <class F> void defineOnce(const char* property, F& field, F value);
     template <class F> void defineOnceForTarget(F& field, F value);

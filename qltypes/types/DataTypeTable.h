@@ -235,17 +235,25 @@ class QL_EXPORT DataTypeTable {
 
     // --- Values by identifier. Unchecked: `id` must be valid. Destination before source. -----------------------------
 
-    void construct(int id, void* p) const;
-    void destruct(int id, void* p) const;
-    void deepCopy(int id, void* dst, const void* src) const;
-    void serialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const;
-    void deserialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const;
-    unsigned long serializeSize(int id, const void* p) const;
-    unsigned long sizeOf(int id) const;
-    void* containedData(int id, void* p) const;
-    int containedDataType(int id) const;
-    unsigned long containedDataNumDims(int id) const;
-    void containedDataDims(int id, const void* p, unsigned long* dims) const;
+    // One index, one virtual call and the function, inline so that no more comes between.
+
+    void construct(int id, void* p) const { recordAt(id)->constructScalarElement(p); }
+    void destruct(int id, void* p) const { recordAt(id)->destroyScalarElement(p); }
+    void deepCopy(int id, void* dst, const void* src) const { recordAt(id)->deepCopyScalarElement(src, dst); }
+    void serialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const {
+        recordAt(id)->serializeScalarElement(src, dst, a, b);
+    }
+    void deserialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const {
+        recordAt(id)->deserializeScalarElement(src, dst, a, b);
+    }
+    unsigned long serializeSize(int id, const void* p) const { return recordAt(id)->serializeSizeScalarElement(p); }
+    unsigned long sizeOf(int id) const { return recordAt(id)->sizeOf(); }
+    void* containedData(int id, void* p) const { return recordAt(id)->containedData(p); }
+    int containedDataType(int id) const { return recordAt(id)->containedDataType(); }
+    unsigned long containedDataNumDims(int id) const { return recordAt(id)->containedDataNumDims(); }
+    void containedDataDims(int id, const void* p, unsigned long* dims) const {
+        recordAt(id)->containedDataDims(p, dims);
+    }
     /// True on success, false when the function of the type failed.
     bool dataConstruct(int id, unsigned long numDims, const unsigned long* dims, unsigned long elementSize,
                        const void* data, void* dst) const;

@@ -19,23 +19,6 @@ template <class T> bool anyNonZero(const void* data, long count) {
 
 } // namespace
 
-// clang-format off
-
-// --- One value -------------------------------------------------------------------------------------------------------
-
-void DataTypeTable::construct(int id, void* p) const                                       { recordAt(id)->constructScalarElement(p); }
-void DataTypeTable::destruct(int id, void* p) const                                        { recordAt(id)->destroyScalarElement(p); }
-void DataTypeTable::deepCopy(int id, void* dst, const void* src) const                     { recordAt(id)->deepCopyScalarElement(src, dst); }
-void DataTypeTable::serialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const   { recordAt(id)->serializeScalarElement(src, dst, a, b); }
-void DataTypeTable::deserialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const { recordAt(id)->deserializeScalarElement(src, dst, a, b); }
-unsigned long DataTypeTable::serializeSize(int id, const void* p) const                    { return recordAt(id)->serializeSizeScalarElement(p); }
-unsigned long DataTypeTable::sizeOf(int id) const                                          { return recordAt(id)->sizeOf(); }
-void* DataTypeTable::containedData(int id, void* p) const                                  { return recordAt(id)->containedData(p); }
-int DataTypeTable::containedDataType(int id) const                                         { return recordAt(id)->containedDataType(); }
-unsigned long DataTypeTable::containedDataNumDims(int id) const                            { return recordAt(id)->containedDataNumDims(); }
-void DataTypeTable::containedDataDims(int id, const void* p, unsigned long* dims) const    { recordAt(id)->containedDataDims(p, dims); }
-// clang-format on
-
 bool DataTypeTable::dataConstruct(int id, unsigned long numDims, const unsigned long* dims, unsigned long elementSize,
                                   const void* data, void* dst) const {
     return failure::succeeds([&] { recordAt(id)->dataConstruct(numDims, dims, elementSize, data, dst); });

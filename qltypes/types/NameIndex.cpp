@@ -26,9 +26,14 @@ std::uint64_t loadTail(const char* p, std::size_t n) {
     return load<std::uint8_t>(p) | load<std::uint8_t>(p + n / 2) << 8 | load<std::uint8_t>(p + n - 1) << 16;
 }
 
+int idOf(std::uint64_t head) { return static_cast<int>(static_cast<std::uint32_t>(head)); }
+std::size_t lengthOf(std::uint64_t head) { return head >> 32; }
+std::uint64_t headOf(int id, std::size_t length) { return static_cast<std::uint32_t>(id) | length << 32; }
+std::size_t wordsOf(std::size_t length) { return 1 + (length + 7) / 8; }
+
 } // namespace
 
-std::uint32_t NameIndex::hashOf(std::string_view name) {
+std::size_t NameIndex::Hash::operator()(std::string_view name) const {
     // Digits of pi and e: odd numbers with no pattern.
     constexpr std::uint64_t k0 = 0x243f6a8885a308d3, k1 = 0x13198a2e03707345, k2 = 0xb7e151628aed2a6b;
     const char* p = name.data();
@@ -40,110 +45,88 @@ std::uint32_t NameIndex::hashOf(std::string_view name) {
         h = mixed(load<std::uint64_t>(p) ^ k1, load<std::uint64_t>(p + n - 8) ^ h);
     else
         h = mixed(loadTail(p, n) ^ k1, h);
-    return static_cast<std::uint32_t>(mixed(h, k2) >> 32);
+    return mixed(h, k2);
 }
 
-std::string_view NameIndex::Slot::name() const {
-    if (kind != isLong) return {bytes, kind - 1u};
-    std::string_view text;
-    std::memcpy(&text, bytes, sizeof text);
-    return text;
+std::size_t NameIndex::Hash::operator()(Place place) const { return operator()(nameAt(*pool, place)); }
+
+bool NameIndex::Equal::operator()(std::string_view name, Place place) const {
+    const std::uint64_t* entry = pool->data() + place;
+    if (lengthOf(*entry) != name.size()) return false;
+    const char* p = name.data();
+    std::size_t n = name.size();
+    for (; n >= 8; p += 8, n -= 8)
+        if (load<std::uint64_t>(p) != *++entry) return false;
+    std::uint64_t rest = 0;
+    std::memcpy(&rest, p, n);
+    return n == 0 || rest == *++entry;
 }
 
-void NameIndex::Slot::setName(std::string_view name) {
-    if (name.size() <= inlineCapacity) {
-        std::memcpy(bytes, name.data(), name.size());
-        kind = static_cast<std::uint8_t>(1 + name.size());
-        return;
-    }
-    char* const text = new char[name.size()];
-    std::memcpy(text, name.data(), name.size());
-    const std::string_view kept(text, name.size());
-    std::memcpy(bytes, &kept, sizeof kept);
-    kind = isLong;
+std::string_view NameIndex::nameAt(const Pool& pool, Place place) {
+    return {reinterpret_cast<const char*>(pool.data() + place + 1), lengthOf(pool[place])};
 }
 
-void NameIndex::Slot::releaseName() {
-    if (kind == isLong) delete[] name().data();
-    kind = isFree;
-}
-
-NameIndex::Slot* NameIndex::findSlot(std::string_view name, std::uint32_t hash) const {
-    if (slots_.empty()) return nullptr;
-    const std::size_t mask = slots_.size() - 1;
-    for (std::size_t i = hash & mask; slots_[i].isUsed(); i = (i + 1) & mask)
-        if (slots_[i].hash == hash && slots_[i].name() == name) return const_cast<Slot*>(&slots_[i]);
-    return nullptr;
-}
+NameIndex::NameIndex() : places_(0, Hash{&pool_}, Equal{&pool_}) {}
 
 int NameIndex::find(std::string_view name, int absent) const {
-    const Slot* slot = findSlot(name, hashOf(name));
-    return slot ? slot->id : absent;
-}
-
-void NameIndex::insert(std::string_view name, int id) {
-    const std::uint32_t hash = hashOf(name);
-    if (!findSlot(name, hash)) enter(name, hash, id);
+    const auto found = places_.find(name);
+    return found != places_.end() ? idOf(pool_[*found]) : absent;
 }
 
 void NameIndex::assign(std::string_view name, int id) {
-    const std::uint32_t hash = hashOf(name);
-    if (Slot* slot = findSlot(name, hash))
-        slot->id = id;
+    const auto found = places_.find(name);
+    if (found != places_.end())
+        pool_[*found] = headOf(id, name.size());
     else
-        enter(name, hash, id);
+        insert(name, id);
 }
 
-void NameIndex::enter(std::string_view name, std::uint32_t hash, int id) {
-    if (used_ * 4 >= slots_.size() * 3) grow();
-    Slot made{};
-    made.hash = hash;
-    made.id = id;
-    made.setName(name);
-    const std::size_t mask = slots_.size() - 1;
-    std::size_t i = hash & mask;
-    while (slots_[i].isUsed())
-        i = (i + 1) & mask;
-    slots_[i] = made;
-    ++used_;
-}
-
-void NameIndex::grow() {
-    std::vector<Slot> larger(slots_.empty() ? 32 : slots_.size() * 2);
-    const std::size_t mask = larger.size() - 1;
-    for (const Slot& slot : slots_) {
-        if (!slot.isUsed()) continue;
-        std::size_t i = slot.hash & mask;
-        while (larger[i].isUsed())
-            i = (i + 1) & mask;
-        larger[i] = slot;
+// One search: the entry goes to the end of the pool and leaves again when its name has a place already.
+void NameIndex::insert(std::string_view name, int id) {
+    const std::size_t place = pool_.size();
+    pool_.resize(place + wordsOf(name.size()));
+    pool_[place] = headOf(id, name.size());
+    std::memcpy(pool_.data() + place + 1, name.data(), name.size());
+    try {
+        if (!places_.insert(static_cast<Place>(place)).second) pool_.resize(place);
+    } catch (...) {
+        pool_.resize(place);
+        throw;
     }
-    slots_.swap(larger);
 }
 
 void NameIndex::erase(std::string_view name) {
-    Slot* found = findSlot(name, hashOf(name));
-    if (!found) return;
-    found->releaseName();
-    --used_;
-    // Close the gap: entries behind it move up unless they would leave their own run.
-    const std::size_t mask = slots_.size() - 1;
-    std::size_t gap = static_cast<std::size_t>(found - slots_.data());
-    for (std::size_t i = (gap + 1) & mask; slots_[i].isUsed(); i = (i + 1) & mask) {
-        const std::size_t home = slots_[i].hash & mask;
-        if (((i - home) & mask) >= ((i - gap) & mask)) {
-            slots_[gap] = slots_[i];
-            gap = i;
+    const auto found = places_.find(name);
+    if (found == places_.end()) return;
+    wasted_ += wordsOf(name.size());
+    places_.erase(found);
+    if (wasted_ > 4096 && wasted_ * 2 > pool_.size()) closeHoles();
+}
+
+// Moves the entries of the pool together. Without memory for that the holes stay.
+void NameIndex::closeHoles() {
+    try {
+        Pool pool;
+        pool.reserve(pool_.size() - wasted_);
+        boost::unordered_flat_set<Place, Hash, Equal> places(places_.size(), Hash{&pool}, Equal{&pool});
+        for (const Place old : places_) {
+            const auto entry = pool_.begin() + old;
+            pool.insert(pool.end(), entry, entry + static_cast<std::ptrdiff_t>(wordsOf(lengthOf(*entry))));
+            places.insert(static_cast<Place>(pool.size() - wordsOf(lengthOf(*entry))));
         }
+        pool_.swap(pool);
+        places_.clear();
+        for (const Place place : places)
+            places_.insert(place);
+        wasted_ = 0;
+    } catch (const std::bad_alloc&) {
     }
-    slots_[gap].kind = isFree;
 }
 
 void NameIndex::clear() {
-    for (Slot& slot : slots_)
-        slot.releaseName();
-    slots_.clear();
-    used_ = 0;
+    places_.clear();
+    pool_.clear();
+    wasted_ = 0;
 }
 
 } // namespace QLTypeSys

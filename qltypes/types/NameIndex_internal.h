@@ -1,6 +1,7 @@
-// The map from type name to identifier: one hash of the text and, for names of up to 23 bytes, one cache line a lookup.
+// The map from type name to identifier.
 //
-// Open addressing with linear probing; a slot keeps the name beside its hash. Lookups take a view and allocate nothing.
+// A flat hash set of 4-byte places, small enough for the nearest caches, over a pool in which the names stand one
+// behind the other, each behind its id and length: one hash and one far cache line a lookup. Lookups allocate nothing.
 #pragma once
 
 #include <cstddef>
@@ -8,14 +9,15 @@
 #include <string_view>
 #include <vector>
 
+#include <boost/unordered/unordered_flat_set.hpp>
+
 namespace QLTypeSys {
 
 class NameIndex {
   public:
-    NameIndex() = default;
+    NameIndex();
     NameIndex(const NameIndex&) = delete;
     NameIndex& operator=(const NameIndex&) = delete;
-    ~NameIndex() { clear(); }
 
     /// The id entered under `name`, or `absent`.
     int find(std::string_view name, int absent) const;
@@ -32,32 +34,32 @@ class NameIndex {
     void clear();
 
   private:
-    static constexpr std::size_t inlineCapacity = 23;
+    // An entry is a head word, id below and length above, then the name with zeros up to a full word. Its place is the
+    // index of its head.
+    using Place = std::uint32_t;
+    using Pool = std::vector<std::uint64_t>;
 
-    // 32 bytes. `bytes` holds the text itself or, of a longer one, where it stands on the heap; its last byte says
-    // which.
-    struct alignas(32) Slot {
-        std::uint32_t hash;
-        int id;
-        char bytes[inlineCapacity];
-        std::uint8_t kind; // isFree, 1 + length of the text, or isLong
-
-        bool isUsed() const { return kind != isFree; }
-        std::string_view name() const;
-        void setName(std::string_view name);
-        void releaseName();
+    struct Hash {
+        using is_transparent = void;
+        using is_avalanching = void;
+        std::size_t operator()(std::string_view name) const;
+        std::size_t operator()(Place place) const;
+        const Pool* pool;
     };
-    static constexpr std::uint8_t isFree = 0;
-    static constexpr std::uint8_t isLong = 255;
-    static_assert(sizeof(Slot) == 32);
+    struct Equal {
+        using is_transparent = void;
+        bool operator()(std::string_view name, Place place) const;
+        bool operator()(Place place, std::string_view name) const { return operator()(name, place); }
+        bool operator()(Place a, Place b) const { return operator()(nameAt(*pool, a), b); }
+        const Pool* pool;
+    };
 
-    static std::uint32_t hashOf(std::string_view name);
-    Slot* findSlot(std::string_view name, std::uint32_t hash) const;
-    void grow();
-    void enter(std::string_view name, std::uint32_t hash, int id);
+    static std::string_view nameAt(const Pool& pool, Place place);
+    void closeHoles();
 
-    std::vector<Slot> slots_; // a power of two of them, or none
-    std::size_t used_ = 0;
+    Pool pool_;
+    boost::unordered_flat_set<Place, Hash, Equal> places_;
+    std::size_t wasted_ = 0; // words of the pool that erased entries left behind
 };
 
 } // namespace QLTypeSys
