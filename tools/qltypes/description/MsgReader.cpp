@@ -35,6 +35,15 @@ TypeDescription pairOfIntegers(const std::string& name, const char* integer) {
     return {name, name, place, std::move(structure)};
 }
 
+// Whether an element of a structure of the description, which has nothing but structures, has the type.
+bool isUsed(const Description& description, const char* typeName) {
+    return std::any_of(description.types.begin(), description.types.end(), [&](const TypeDescription& type) {
+        const auto& elements = std::get<StructureDescription>(type.kind).elements;
+        return std::any_of(elements.begin(), elements.end(),
+                           [&](const ElementDescription& element) { return element.type.name == typeName; });
+    });
+}
+
 std::string reasonOf(RefusalKind kind, const MessageField& field) {
     const std::string& name = field.element.name;
     switch (kind) {
@@ -151,13 +160,8 @@ Description MsgReader::read() {
     description.numMessages = messages_.size();
     for (Message& message : messages_)
         describe(message, description);
-    for (const auto& [name, integer] : {std::pair("time", "uint32"), std::pair("duration", "int32")}) {
-        const bool isUsed = std::any_of(description.types.begin(), description.types.end(), [&](const auto& type) {
-            const auto& elements = std::get<StructureDescription>(type.kind).elements;
-            return std::any_of(elements.begin(), elements.end(), [&](auto& e) { return e.type.name == name; });
-        });
-        if (isUsed) description.types.push_back(pairOfIntegers(name, integer));
-    }
+    if (isUsed(description, "time")) description.types.push_back(pairOfIntegers("time", "uint32"));
+    if (isUsed(description, "duration")) description.types.push_back(pairOfIntegers("duration", "int32"));
     return description;
 }
 

@@ -1,0 +1,195 @@
+"""How the command is called: what it prints where, and how it ends.
+
+usage: calls_test.py QLTYPES
+"""
+
+import json
+import os
+import pathlib
+import pty
+import subprocess
+import sys
+import tempfile
+import unittest
+
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+QLTYPES = sys.argv[1]
+OUTER = ROOT / "examples/outer.json"
+
+OUTER_TEXT = """\
+Outer
+  offset  size  element    type
+       0     1  x          int8
+       1     7  (padding)
+       8    64  y[2]       Inner  aligned to 8: not built-in, size 32
+      72    32  z          Inner
+  104 bytes, 7 of them padding; elements: 3 immediate, 7 flat, 16 raw, 12 depth-first
+
+Inner
+  offset  size  element  type
+       0    24  a[3]     double
+      24     8  b        complex single
+  32 bytes, 0 of them padding; elements: 2 immediate, 2 flat, 5 raw, 3 depth-first
+
+2 structures laid out
+"""
+
+
+def run(*arguments, stdin=""):
+    result = subprocess.run([QLTYPES, *map(str, arguments)], input=stdin, capture_output=True, text=True)
+    return result.returncode, result.stdout, result.stderr
+
+
+class Calls(unittest.TestCase):
+    maxDiff = None
+
+    def setUp(self):
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        self.folder = pathlib.Path(folder.name)
+
+    def write(self, name, text):
+        path = self.folder / name
+        path.parent.mkdir(parents=True, exist_ok=True)
+        path.write_bytes(text.encode() if isinstance(text, str) else text)
+        return path
+
+    def assertBad(self, complaint, *arguments, stdin=""):
+        """One line on standard error, nothing on standard output, 2."""
+        self.assertEqual(run(*arguments, stdin=stdin), (2, "", complaint + "\n"))
+
+    def assertBadCall(self, *arguments):
+        code, out, complaint = run(*arguments)
+        self.assertEqual((code, out), (2, ""))
+        self.assertNotEqual(complaint, "")
+
+    def test_help_and_version(self):
+        for arguments, wanted in ((["--help"], "layout"), (["layout", "--help"], "Examples:"),
+                                  (["--version"], "qltypes 0.")):
+            with self.subTest(arguments=arguments):
+                code, out, complaint = run(*arguments)
+                self.assertEqual((code, complaint), (0, ""))
+                self.assertIn(wanted, out)
+
+    def test_bad_calls(self):
+        for arguments in ([], ["layuot"], ["layout"], ["layout", "--yaml", OUTER], ["layout", OUTER, "--only"]):
+            with self.subTest(arguments=arguments):
+                self.assertBadCall(*arguments)
+
+    def test_table(self):
+        self.assertEqual(run("layout", OUTER), (0, OUTER_TEXT, ""))
+
+    def test_standard_input(self):
+        self.assertEqual(run("layout", "-", stdin=OUTER.read_text()), (0, OUTER_TEXT, ""))
+
+    def test_only(self):
+        code, out, _ = run("layout", OUTER, "--only", "Inner")
+        self.assertEqual(code, 0)
+        self.assertEqual(out, OUTER_TEXT[OUTER_TEXT.index("Inner\n"):].replace("2 structures", "1 structures"))
+        self.assertBad("qltypes: --only: no structure 'Middle' was laid out", "layout", OUTER, "--only", "Inner,Middle")
+
+    def test_json(self):
+        code, out, complaint = run("layout", "--json", OUTER)
+        self.assertEqual((code, complaint), (0, ""))
+        document = json.loads(out)
+        self.assertEqual(list(document), ["types", "structures", "refused", "summary"])
+        self.assertEqual(document["summary"], {"numMessages": 0, "numStructures": 2, "numRefused": 0})
+        outer = document["structures"][0]
+        self.assertEqual(outer.pop("elements")[1], {
+            "name": "y", "type": "Inner", "dimensions": [2], "complex": False, "sampling": "sample",
+            "dimensionsMode": "fixed", "min": None, "max": None, "unit": None, "offset": 8, "size": 64, "padding": 0,
+            "moved": {"from": 1, "alignment": 8, "reason": "aligned to 8: not built-in, size 32"}})
+        self.assertEqual(outer, {
+            "name": "Outer", "label": "Outer", "size": 104, "padding": 7, "numElements": 3, "numFlatElements": 7,
+            "numRawElements": 16, "numDFSElements": 12})
+
+    def test_every_property_is_shown(self):
+        _, out, _ = run("layout", ROOT / "examples/drive.json")
+        self.assertEqual(out, """\
+Types that are no structures
+  type         size  kind
+  sfix32_En20     4  number
+  ufix32_En16     4  number
+  sfix16_En7      2  number
+  sfix16_En5      2  number
+  half            2  number
+  Speed           4  alias of sfix32_En20
+  FaultLog       20  client
+""")
+
+    def test_messages(self):
+        self.write("demo_msgs/msg/Stamped.msg", "time stamp\nuint8 flag\nint64 count\n")
+        self.write("demo_msgs/msg/Named.msg", "Stamped s\nstring name\n")
+        code, out, complaint = run("layout", self.folder / "demo_msgs/msg")
+        self.assertEqual((code, complaint), (0, ""))
+        self.assertEqual(out, "")
+
+    def test_unreadable_inputs(self):
+        absent = self.folder / "absent.json"
+        self.assertBad(f"{absent}: cannot be read: No such file or directory", "layout", absent)
+        message = self.folder / "p/msg/Absent.msg"
+        self.assertBad(f"{message}: cannot be read: No such file or directory", "layout", message)
+        self.assertBad(f"{self.folder}: the folder has no .msg files", "layout", self.folder)
+
+    def test_nothing_is_printed_of_the_good_inputs_before_a_bad_one(self):
+        bad = self.write("bad.json", '{"types": [\n  {"name": "P", "size": 0}\n]}')
+        self.assertBad(f"{bad}: /types/0/size: must be a whole number from 1 to 2147483647, not 0", "layout", OUTER, bad)
+
+    def test_types_of_several_inputs_share_one_table(self):
+        more = self.write("more.json", '{"types": [{"name": "More", "elements": [{"name": "o", "type": "Outer"}]}]}')
+        code, out, _ = run("layout", more, OUTER, "--only", "More")
+        self.assertEqual(code, 0)
+        self.assertIn("104  o", out)
+        self.assertBad(f"{more}: /types/0/elements/0/type: unknown type 'Outer'", "layout", more)
+        self.assertBad(f"{OUTER}: /types/0: 'Outer' is described already at {OUTER}: /types/0", "layout", OUTER, OUTER)
+
+    def test_garbage(self):
+        for name, content in (("a.json", bytes(range(256)) * 40), ("b.json", b"\0" * 4096), ("p/msg/C.msg", b"\xff\xfe\0")):
+            with self.subTest(name=name):
+                path = self.write(name, content)
+                code, out, complaint = run("layout", path)
+                self.assertEqual((code, out), (2, ""))
+                self.assertTrue(complaint.startswith(f"{path}:1:1: "), complaint)
+                self.assertEqual(complaint.count("\n"), 1)
+
+    def test_a_thousand_deep(self):
+        brackets = self.write("brackets.json", '{"types": ' + "[" * 1000 + "]" * 1000 + "}")
+        self.assertBad(f"{brackets}: /types/0: must be an object, not an array", "layout", brackets)
+        chain = [{"name": f"T{i}", "elements": [{"name": "x", "type": f"T{i + 1}" if i < 999 else "int8"}]}
+                 for i in range(1000)]
+        path = self.write("chain.json", json.dumps({"types": chain}))
+        code, out, complaint = run("layout", "--json", path)
+        self.assertEqual((code, complaint), (0, ""))
+        self.assertEqual({structure["size"] for structure in json.loads(out)["structures"]}, {8})
+
+    def test_too_large(self):
+        path = self.write("large.json", json.dumps({"types": [{"name": "P", "elements": [
+            {"name": "x", "type": "double", "dimensions": [2147483647], "complex": True}]}]}))
+        code, out, complaint = run("layout", path)
+        self.assertEqual((code, out, complaint.count("\n")), (2, "", 1))
+        self.assertTrue(complaint.startswith(f"{path}: /types/0: "), complaint)
+
+    def test_full_output(self):
+        with open("/dev/full", "w") as full:
+            result = subprocess.run([QLTYPES, "layout", OUTER], stdout=full, stderr=subprocess.PIPE, text=True)
+        self.assertEqual(result.returncode, 2)
+        self.assertEqual(result.stderr, "standard output: No space left on device\n")
+
+    def test_colours_on_a_terminal_only(self):
+        self.assertNotIn("\x1b", run("layout", OUTER)[1])
+        ours, theirs = pty.openpty()
+        with subprocess.Popen([QLTYPES, "layout", OUTER], stdout=theirs) as process:
+            os.close(theirs)
+            shown = b""
+            try:
+                while chunk := os.read(ours, 4096):
+                    shown += chunk
+            except OSError:  # the other side is closed
+                pass
+            self.assertEqual(process.wait(), 0)
+        os.close(ours)
+        self.assertIn(b"\x1b[1mOuter\x1b[0m", shown)
+
+
+if __name__ == "__main__":
+    unittest.main(argv=sys.argv[:1])

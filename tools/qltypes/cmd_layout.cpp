@@ -1,0 +1,99 @@
+// qltypes layout: where each element of a structure lies, and why.
+#include "Commands.h"
+
+#include <algorithm>
+#include <filesystem>
+
+#include <fmt/format.h>
+
+#include "description/Files.h"
+#include "description/JsonReader.h"
+#include "description/MsgReader.h"
+#include "output/LayoutJson.h"
+#include "output/LayoutText.h"
+#include "output/Output.h"
+#include "table/TypeLoader.h"
+
+namespace inspector {
+namespace {
+
+void append(Description& description, Description&& more) {
+    std::move(more.types.begin(), more.types.end(), std::back_inserter(description.types));
+    std::move(more.refusals.begin(), more.refusals.end(), std::back_inserter(description.refusals));
+    description.numMessages += more.numMessages;
+}
+
+// Reads all inputs: JSON descriptions, standard input as one, message definitions and folders of these.
+Description readInputs(const std::vector<std::string>& inputs) {
+    Description description;
+    MsgReader messages;
+    bool hasMessages = false;
+    for (const std::string& input : inputs) {
+        const std::filesystem::path path = input;
+        std::error_code error;
+        if (input == "-") {
+            append(description, readJsonDescription("(standard input)", readStandardInput()));
+        } else if (std::filesystem::is_directory(path, error)) {
+            messages.addFolder(path);
+            hasMessages = true;
+        } else if (path.extension() == ".msg") {
+            messages.addFile(path);
+            hasMessages = true;
+        } else {
+            append(description, readJsonDescription(input, readFileText(path)));
+        }
+    }
+    if (hasMessages) append(description, messages.read());
+    return description;
+}
+
+// Keeps the structures of the given names, in that order.
+void select(Layout& layout, const std::vector<std::string>& names) {
+    std::vector<StructureLayout> selected;
+    for (const std::string& name : names) {
+        const auto at = std::find_if(layout.structures.begin(), layout.structures.end(), [&](auto& structure) {
+            return structure.label == name || structure.name == name;
+        });
+        if (at == layout.structures.end())
+            throw UsageError(fmt::format("--only: no structure '{}' was laid out", name));
+        selected.push_back(*at);
+    }
+    layout.structures = std::move(selected);
+}
+
+} // namespace
+
+void addLayoutCommand(CLI::App& app) {
+    struct Options {
+        std::vector<std::string> inputs;
+        std::vector<std::string> only;
+        bool asJson = false;
+    };
+    const auto options = std::make_shared<Options>();
+    CLI::App* const command =
+        app.add_subcommand("layout", "Lays structures out and shows where each element lies, and why");
+    command
+        ->add_option("INPUT", options->inputs,
+                     "JSON type descriptions (- is standard input), .msg files, folders of .msg files")
+        ->required();
+    command->add_option("--only", options->only, "Show only these structures, names divided by commas")->delimiter(',');
+    command->add_flag("--json", options->asJson, "Print JSON with stable keys");
+    command->footer(
+        "Examples:\n"
+        "  qltypes layout types.json\n"
+        "  qltypes layout --json types.json | jq '.structures[].size'\n"
+        "  qltypes layout /usr/share/geometry_msgs/msg --only geometry_msgs/Pose\n"
+        "  echo '{\"types\": [{\"name\": \"P\", \"elements\": [{\"name\": \"x\", \"type\": \"double\"}]}]}' |"
+        " qltypes layout -");
+    command->callback([options] {
+        const Description description = readInputs(options->inputs);
+        QLTypeSys::DataTypeTable table;
+        TypeLoader loader(table);
+        loader.load(description);
+        Layout layout = loader.layout(description);
+        if (!options->only.empty()) select(layout, options->only);
+        print(options->asJson ? layoutJson(layout) : layoutText(layout, !options->only.empty(), coloursOfOutput()));
+    });
+}
+
+} // namespace inspector

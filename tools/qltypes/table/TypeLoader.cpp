@@ -1,0 +1,193 @@
+#include "table/TypeLoader.h"
+
+#include <algorithm>
+#include <stdexcept>
+
+#include <fmt/format.h>
+
+#include "description/Resolver.h"
+#include "qlplatform/services/Diagnostics.h"
+#include "qltypes/fixed_point/IdentifierString.h"
+#include "qltypes/fixed_point/TypeNames.h"
+#include "qltypes/structures/ElementAccess.h"
+#include "qltypes/structures/StructDataType.h"
+#include "qltypes/structures/StructDataTypeUtils.h"
+#include "qltypes/structures/StructElement.h"
+#include "qltypes/structures/StructLayout.h"
+#include "qltypes/types/DataTypeTableUtils.h"
+
+namespace inspector {
+namespace {
+
+constexpr DataTypeSource sourceOfClients = DataTypeSource(2);
+
+bool isNumberTypeName(const std::string& name) { return FXP::isQLTypeNameWithFxpDataTypeProp(name.c_str()); }
+
+// Discards the diagnostic, and complains with its text where there is one.
+void check(qlsvDiagnosticImpl* diagnostic, const Place& place) {
+    if (!diagnostic) return;
+    const std::string text = diagnostic->text(0);
+    qlsvDiscardDiagnostic(diagnostic);
+    throw InputError(place, text);
+}
+
+// Runs `work`, and complains with the text of what it throws.
+template <class Work> auto checked(const Place& place, Work work) {
+    try {
+        return work();
+    } catch (const foundation::core::except::IException& e) {
+        throw InputError(place, e.what());
+    }
+}
+
+// Bytes of the integer or float that holds a value: 1, 2, 4, 8, and whole 8-byte words above 64 bits.
+int containerSize(const fxpDataTypeProp& prop) {
+    if (prop.DataTypeMode == FXP_DT_SCALED_DOUBLE) return 8;
+    for (const int size : {1, 2, 4, 8}) {
+        if (prop.WordLength <= 8 * size) return size;
+    }
+    return (prop.WordLength - 1) / 64 * 8 + 8;
+}
+
+// Why an element that would begin at `from` begins elsewhere.
+Move moveOf(std::int64_t from, int typeSize, bool isBuiltIn) {
+    const int alignment = isBuiltIn ? typeSize : typeSize > 7 ? 8 : typeSize > 3 ? 4 : 2;
+    const char* const kind = isBuiltIn ? "built-in" : "not built-in";
+    return {from, alignment, fmt::format("aligned to {}: {}, size {}", alignment, kind, typeSize)};
+}
+
+} // namespace
+
+int TypeLoader::registerNumberType(const TypeReference& reference) {
+    fxpDataTypeProp prop;
+    try {
+        prop = checked(reference.place, [&] { return identifierStringToFxpDataType(reference.name); });
+    } catch (const std::bad_cast&) { // the reader lets the exception of its number cast through
+        throw InputError(reference.place, fmt::format("the exponent of '{}' does not fit 32 bits", reference.name));
+    }
+    const Place& place = reference.place;
+    int id = DATA_TYPE_ID_INVALID;
+    check(DtRegisterDataType(&table_, nullptr, reference.name.c_str(), dtSourceFixpt, &id), place);
+    check(DtSetDataTypeSize(&table_, nullptr, id, containerSize(prop)), place);
+    check(DtSetDataTypePropertiesSize(&table_, nullptr, id, sizeof prop), place);
+    check(DtSetDataTypeProperties(&table_, nullptr, id, &prop), place);
+    numberTypes_.push_back(reference.name);
+    return id;
+}
+
+int TypeLoader::idOf(const TypeReference& reference) {
+    const int id = table_.getDataTypeId(reference.name.c_str());
+    return id != DATA_TYPE_ID_INVALID ? id : registerNumberType(reference);
+}
+
+int TypeLoader::unitIdOf(const std::string& unit) {
+    if (unit.empty()) return -1;
+    const auto at = std::find(units_.begin(), units_.end(), unit);
+    if (at == units_.end()) units_.push_back(unit);
+    return static_cast<int>(at - units_.begin());
+}
+
+void TypeLoader::registerType(const TypeDescription& type) {
+    const char* const name = type.name.c_str();
+    labelsByName_.emplace(type.name, type.label);
+    if (const auto* alias = std::get_if<AliasDescription>(&type.kind)) {
+        const int target = idOf(alias->target);
+        checked(type.place, [&] { return table_.registerAliasDataType(name, sourceOfClients, target, nullptr); });
+    } else if (const auto* client = std::get_if<ClientTypeDescription>(&type.kind)) {
+        int id = DATA_TYPE_ID_INVALID;
+        check(DtRegisterDataType(&table_, nullptr, name, sourceOfClients, &id), type.place);
+        check(DtSetDataTypeSize(&table_, nullptr, id, client->size), type.place);
+    } else {
+        registerStructure(type, std::get<StructureDescription>(type.kind));
+    }
+}
+
+void TypeLoader::registerStructure(const TypeDescription& type, const StructureDescription& structure) {
+    const int id =
+        checked(type.place, [&] { return table_.registerStructDataType(type.name.c_str(), sourceOfClients, nullptr); });
+    const long numElements = static_cast<long>(structure.elements.size());
+    check(DtSetDataTypeNumElements(&table_, nullptr, id, numElements), type.place);
+    for (long i = 0; i < numElements; ++i)
+        fillElement(id, i, structure.elements[static_cast<std::size_t>(i)]);
+    check(DtComputeDerivedStructAttributes(&table_, id), type.place);
+}
+
+void TypeLoader::fillElement(int structureId, long index, const ElementDescription& element) {
+    const Place& place = element.type.place;
+    StructElement& record =
+        *DtGetStructDataTypeObject(&table_, structureId)->getElements()[static_cast<std::size_t>(index)];
+    record.setName(element.name.c_str());
+    record.setDataTypeId(idOf(element.type));
+    record.setUnitId(unitIdOf(element.unit));
+    record.setSignalType(element.isComplex);
+    record.setSamplingMode(element.isFrameBased);
+    record.setDimensionsMode(element.hasVariableDimensions);
+    record.setMin(element.min);
+    record.setMax(element.max);
+    const int numDimensions = static_cast<int>(element.dimensions.size());
+    check(DtSetDataTypeElementNumDimensions(&table_, nullptr, structureId, index, numDimensions), place);
+    for (int i = 0; i < numDimensions; ++i) {
+        const long dimension = element.dimensions[static_cast<std::size_t>(i)];
+        check(DtSetDataTypeElementDimension(&table_, nullptr, structureId, index, i, dimension), place);
+    }
+}
+
+void TypeLoader::load(const Description& description) {
+    for (const std::size_t index : registrationOrder(description, isNumberTypeName))
+        registerType(description.types[index]);
+}
+
+StructureLayout TypeLoader::structureLayout(const TypeDescription& type, const StructureDescription& structure) const {
+    const int id = table_.getDataTypeId(type.name.c_str());
+    const QLTypeSys::ImmediateElementAccess view(&table_, id);
+    StructureLayout layout{type.name, type.label, DtGetDataTypeSize(&table_, id), 0,
+                           DtGetDataTypeNumFlatElements(&table_, id), DtGetDataTypeNumRawElements(&table_, id),
+                           DtGetDataTypeNumDFSElements(&table_, id), {}};
+    layout.elements.reserve(structure.elements.size());
+    std::int64_t end = 0; // of the element before
+    for (long i = 0; i < view.getNumElements(); ++i) {
+        const int typeId = view.getDataTypeId(i);
+        const int typeSize = DtGetDataTypeSize(&table_, typeId);
+        ElementLayout element;
+        element.description = structure.elements[static_cast<std::size_t>(i)];
+        element.typeLabel = labelOf(element.description.type.name);
+        element.offset = view.getOffset(i);
+        element.size = view.getComplexWidth(i) * typeSize;
+        element.padding = view.getPadding(i);
+        const bool isBuiltIn = DtCheckForBuiltInDataType(DtGetDataTypeIdAliasedThruTo(&table_, typeId));
+        if (element.offset != end) element.move = moveOf(end, typeSize, isBuiltIn);
+        end = element.offset + element.size;
+        layout.padding += element.padding;
+        layout.elements.push_back(std::move(element));
+    }
+    return layout;
+}
+
+OtherType TypeLoader::otherType(const std::string& name, const char* kind) const {
+    return {name, kind, "", DtGetDataTypeSize(&table_, table_.getDataTypeId(name.c_str()))};
+}
+
+std::string TypeLoader::labelOf(const std::string& name) const {
+    const auto at = labelsByName_.find(name);
+    return at == labelsByName_.end() ? name : at->second;
+}
+
+Layout TypeLoader::layout(const Description& description) const {
+    Layout layout;
+    for (const std::string& name : numberTypes_) layout.otherTypes.push_back(otherType(name, "number"));
+    for (const TypeDescription& type : description.types) {
+        if (const auto* structure = std::get_if<StructureDescription>(&type.kind)) {
+            layout.structures.push_back(structureLayout(type, *structure));
+        } else if (const auto* alias = std::get_if<AliasDescription>(&type.kind)) {
+            layout.otherTypes.push_back(otherType(type.name, "alias"));
+            layout.otherTypes.back().target = labelOf(alias->target.name);
+        } else {
+            layout.otherTypes.push_back(otherType(type.name, "client"));
+        }
+    }
+    layout.refusals = description.refusals;
+    layout.numMessages = description.numMessages;
+    return layout;
+}
+
+} // namespace inspector
