@@ -18,7 +18,7 @@ OUTER = ROOT / "examples/outer.json"
 
 OUTER_TEXT = """\
 Outer
-  offset  size  element    type
+  offset  size  element    type   notes
        0     1  x          int8
        1     7  (padding)
        8    64  y[2]       Inner  aligned to 8: not built-in, size 32
@@ -29,7 +29,7 @@ Inner
   offset  size  element  type
        0    24  a[3]     double
       24     8  b        complex single
-  32 bytes, 0 of them padding; elements: 2 immediate, 2 flat, 5 raw, 3 depth-first
+  32 bytes, no padding; elements: 2 immediate, 2 flat, 5 raw, 3 depth-first
 
 2 structures laid out
 """
@@ -85,7 +85,7 @@ class Calls(unittest.TestCase):
     def test_only(self):
         code, out, _ = run("layout", OUTER, "--only", "Inner")
         self.assertEqual(code, 0)
-        self.assertEqual(out, OUTER_TEXT[OUTER_TEXT.index("Inner\n"):].replace("2 structures", "1 structures"))
+        self.assertEqual(out, OUTER_TEXT[OUTER_TEXT.index("\nInner\n") + 1:].replace("2 structures", "1 structure"))
         self.assertBad("qltypes: --only: no structure 'Middle' was laid out", "layout", OUTER, "--only", "Inner,Middle")
 
     def test_json(self):
@@ -109,12 +109,35 @@ class Calls(unittest.TestCase):
 Types that are no structures
   type         size  kind
   sfix32_En20     4  number
-  ufix32_En16     4  number
   sfix16_En7      2  number
   sfix16_En5      2  number
   half            2  number
+  ufix32_En16     4  number
   Speed           4  alias of sfix32_En20
   FaultLog       20  client
+
+Drive
+  offset  size  element         type            notes
+       0     1  enabled         boolean
+       1     3  (padding)
+       4     4  speed           Speed           unit rad/s; min -157; max 157; aligned to 4: not built-in, size 4
+       8    24  phases[3]       Phase
+      32     4  position        ufix32_En16     unit rev
+      36     4  (padding)
+      40    20  fault           FaultLog        aligned to 8: not built-in, size 20
+      60   128  spectrum[8][2]  complex single  frame based
+     188     4  (padding)                       size rounded up to a multiple of 8
+  192 bytes, 11 of them padding; elements: 6 immediate, 14 flat, 45 raw, 19 depth-first
+
+Phase
+  offset  size  element      type        notes
+       0     2  current      sfix16_En7  unit A
+       2     2  voltage      sfix16_En5  unit V
+       4     2  temperature  half        unit degC
+       6     2  (padding)                size rounded up to a multiple of 8
+  8 bytes, 2 of them padding; elements: 3 immediate, 3 flat, 3 raw, 4 depth-first
+
+2 structures laid out
 """)
 
     def test_messages(self):
@@ -122,7 +145,31 @@ Types that are no structures
         self.write("demo_msgs/msg/Named.msg", "Stamped s\nstring name\n")
         code, out, complaint = run("layout", self.folder / "demo_msgs/msg")
         self.assertEqual((code, complaint), (0, ""))
-        self.assertEqual(out, "")
+        self.assertEqual(out, """\
+Types that are no structures
+  type   size  kind
+  int64     8  number
+
+demo_msgs/Stamped
+  offset  size  element    type   notes
+       0     8  stamp      time
+       8     1  flag       uint8
+       9     7  (padding)
+      16     8  count      int64  aligned to 8: not built-in, size 8
+  24 bytes, 7 of them padding; elements: 3 immediate, 4 flat, 4 raw, 6 depth-first
+
+time
+  offset  size  element  type
+       0     4  sec      uint32
+       4     4  nsec     uint32
+  8 bytes, no padding; elements: 2 immediate, 2 flat, 2 raw, 3 depth-first
+
+Messages that cannot be expressed
+  message          why
+  demo_msgs/Named  field 'name' is text
+
+2 messages read, 1 laid out, 1 refused: 1 with text
+""")
 
     def test_unreadable_inputs(self):
         absent = self.folder / "absent.json"

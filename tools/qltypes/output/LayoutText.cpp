@@ -47,10 +47,11 @@ std::string structureText(const StructureLayout& structure, const Colours& colou
                       isLast ? "size rounded up to a multiple of 8" : ""},
                      true);
     }
-    return fmt::format(
-        "{}\n{}  {} bytes, {} of them padding; elements: {} immediate, {} flat, {} raw, {} depth-first\n\n",
-        colours.bold(structure.label), table.text("  ", colours), structure.size, structure.padding,
-        structure.elements.size(), structure.numFlatElements, structure.numRawElements, structure.numDFSElements);
+    const std::string padding = structure.padding == 0 ? "no" : number(structure.padding) + " of them";
+    return fmt::format("{}\n{}  {} bytes, {} padding; elements: {} immediate, {} flat, {} raw, {} depth-first\n\n",
+                       colours.bold(structure.label), table.text("  ", colours), structure.size, padding,
+                       structure.elements.size(), structure.numFlatElements, structure.numRawElements,
+                       structure.numDFSElements);
 }
 
 std::string otherTypesText(const std::vector<OtherType>& types, const Colours& colours) {
@@ -69,15 +70,18 @@ std::string refusalsText(const std::vector<Refusal>& refusals, const Colours& co
 }
 
 std::string summaryText(const Layout& layout) {
-    if (layout.numMessages == 0) return fmt::format("{} structures laid out\n", layout.structures.size());
+    if (layout.numMessages == 0) {
+        const std::size_t count = layout.structures.size();
+        return fmt::format("{} structure{} laid out\n", count, count == 1 ? "" : "s");
+    }
     std::string text = fmt::format("{} messages read, {} laid out, {} refused", layout.numMessages,
                                    layout.numMessages - layout.refusals.size(), layout.refusals.size());
     // clang-format off
     constexpr std::array<std::pair<RefusalKind, const char*>, 4> kinds = {{
-        {RefusalKind::Text,           "have a text"},
-        {RefusalKind::VariableLength, "have an array of any length"},
-        {RefusalKind::NoFields,       "have no fields"},
-        {RefusalKind::UsesRefused,    "contain a refused message"},
+        {RefusalKind::Text,           "with text"},
+        {RefusalKind::VariableLength, "with an array of any length"},
+        {RefusalKind::NoFields,       "without fields"},
+        {RefusalKind::UsesRefused,    "containing a refused one"},
     }};
     // clang-format on
     std::vector<std::string> counts;

@@ -140,9 +140,14 @@ void TypeLoader::load(const Description& description) {
 StructureLayout TypeLoader::structureLayout(const TypeDescription& type, const StructureDescription& structure) const {
     const int id = table_.getDataTypeId(type.name.c_str());
     const QLTypeSys::ImmediateElementAccess view(&table_, id);
-    StructureLayout layout{type.name, type.label, DtGetDataTypeSize(&table_, id), 0,
-                           DtGetDataTypeNumFlatElements(&table_, id), DtGetDataTypeNumRawElements(&table_, id),
-                           DtGetDataTypeNumDFSElements(&table_, id), {}};
+    StructureLayout layout{type.name,
+                           type.label,
+                           DtGetDataTypeSize(&table_, id),
+                           0,
+                           DtGetDataTypeNumFlatElements(&table_, id),
+                           DtGetDataTypeNumRawElements(&table_, id),
+                           DtGetDataTypeNumDFSElements(&table_, id),
+                           {}};
     layout.elements.reserve(structure.elements.size());
     std::int64_t end = 0; // of the element before
     for (long i = 0; i < view.getNumElements(); ++i) {
@@ -174,7 +179,8 @@ std::string TypeLoader::labelOf(const std::string& name) const {
 
 Layout TypeLoader::layout(const Description& description) const {
     Layout layout;
-    for (const std::string& name : numberTypes_) layout.otherTypes.push_back(otherType(name, "number"));
+    for (const std::string& name : numberTypes_)
+        layout.otherTypes.push_back(otherType(name, "number"));
     for (const TypeDescription& type : description.types) {
         if (const auto* structure = std::get_if<StructureDescription>(&type.kind)) {
             layout.structures.push_back(structureLayout(type, *structure));
