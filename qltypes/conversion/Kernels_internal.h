@@ -18,6 +18,14 @@ namespace QLTypeSys::conversion {
 template <class D> inline constexpr D lowest = std::numeric_limits<D>::min();
 template <class D> inline constexpr D highest = std::numeric_limits<D>::max();
 
+/// The highest value that both types have; of a boolean, 1.
+template <class S, class D> constexpr auto largestCommon() {
+    if constexpr (isBoolean<D>)
+        return S{1};
+    else
+        return std::cmp_less(highest<S>, highest<D>) ? highest<S> : static_cast<S>(highest<D>);
+}
+
 /// 2 to the width of the integer type, in double.
 template <class D> inline constexpr double modulus = 4.0 * (1ULL << (8 * sizeof(D) - 2));
 
@@ -111,6 +119,7 @@ template <class S, class D, fxpModeRounding_tag rounding> constexpr OverflowBoun
 /// The smallest double whose conversion to single is infinite under the default rounding: half a unit above the
 /// largest single, where the tie goes to the even neighbour.
 inline constexpr double infiniteAsSingleFrom = 0x1.ffffffp+127;
+inline constexpr double largestDouble = std::numeric_limits<double>::max();
 
 /// True when s does not fit into D under the rounding mode. NaN always fits.
 template <class S, class D, fxpModeRounding_tag rounding> bool overflows(S s) {
@@ -118,7 +127,7 @@ template <class S, class D, fxpModeRounding_tag rounding> bool overflows(S s) {
         return false;
     } else if constexpr (isFloating<D>) {
         const double magnitude = std::fabs(s);
-        return magnitude >= infiniteAsSingleFrom && magnitude <= std::numeric_limits<double>::max();
+        return magnitude >= infiniteAsSingleFrom && magnitude <= largestDouble;
     } else if constexpr (isFloating<S>) {
         constexpr OverflowBounds<S> bounds = overflowBounds<S, D, rounding>();
         return (bounds.aboveIsOutside ? s >= bounds.above : s > bounds.above) ||

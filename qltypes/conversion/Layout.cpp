@@ -86,6 +86,7 @@ class Conversion {
             realPartsOnly();
         else
             realToComplex();
+        if (pastCaches_) levelInUse->finishCopies();
         return kept_;
     }
 

@@ -16,31 +16,37 @@ template <class T> T loadElement(const std::byte* from, std::size_t i) {
 
 struct PortableRuns {
     template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
-    static void convertRun(const std::byte* src, std::byte* dst, std::size_t count) {
-        if constexpr (copiesBytes<S, D, overflow>) {
-            std::memmove(dst, src, count * sizeof(D));
-        } else {
-            for (std::size_t i = 0; i < count; ++i) {
-                const D v = converted<S, D, rounding, overflow>(loadElement<S>(src, i));
-                std::memcpy(dst + i * sizeof(D), &v, sizeof(D));
+    static constexpr ConvertRun convertRun() {
+        return [](const std::byte* src, std::byte* dst, std::size_t count) {
+            if constexpr (copiesBytes<S, D, overflow>) {
+                std::memmove(dst, src, count * sizeof(D));
+            } else {
+                for (std::size_t i = 0; i < count; ++i) {
+                    const D v = converted<S, D, rounding, overflow>(loadElement<S>(src, i));
+                    std::memcpy(dst + i * sizeof(D), &v, sizeof(D));
+                }
             }
-        }
+        };
     }
 
-    template <class S, class D> static bool surviveRun(const std::byte* src, std::size_t count) {
-        for (std::size_t i = 0; i < count; ++i)
-            if (!survives<S, D>(loadElement<S>(src, i))) return false;
-        return true;
+    template <class S, class D> static constexpr TestRun surviveRun() {
+        return [](const std::byte* src, std::size_t count) {
+            for (std::size_t i = 0; i < count; ++i)
+                if (!survives<S, D>(loadElement<S>(src, i))) return false;
+            return true;
+        };
     }
 
-    template <class S, class D, fxpModeRounding_tag rounding>
-    static bool overflowRun(const std::byte* src, std::size_t count) {
-        for (std::size_t i = 0; i < count; ++i)
-            if (overflows<S, D, rounding>(loadElement<S>(src, i))) return true;
-        return false;
+    template <class S, class D, fxpModeRounding_tag rounding> static constexpr TestRun overflowRun() {
+        return [](const std::byte* src, std::size_t count) {
+            for (std::size_t i = 0; i < count; ++i)
+                if (overflows<S, D, rounding>(loadElement<S>(src, i))) return true;
+            return false;
+        };
     }
 
     static void copyToMemory(const std::byte* src, std::byte* dst, std::size_t bytes) { std::memcpy(dst, src, bytes); }
+    static void finishCopies() {}
 };
 
 } // namespace

@@ -8,8 +8,20 @@ constinit const Level* levelInUse = &portableLevel;
 constinit std::size_t cachedBytes = std::size_t{32} << 20;
 
 std::span<const Level* const> availableLevels() {
+#ifdef __x86_64__
+    static constexpr const Level* levels[] = {&portableLevel, &avx512Level};
+    const auto supported = [] {
+        __builtin_cpu_init();
+        if (!__builtin_cpu_supports("avx2") || !__builtin_cpu_supports("fma")) return 1;
+        const bool all512 = __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") &&
+                            __builtin_cpu_supports("avx512dq") && __builtin_cpu_supports("avx512vl");
+        return all512 ? 2 : 1;
+    };
+    return std::span(levels).first(static_cast<std::size_t>(supported()));
+#else
     static constexpr const Level* levels[] = {&portableLevel};
     return levels;
+#endif
 }
 
 namespace {

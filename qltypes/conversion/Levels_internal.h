@@ -25,35 +25,42 @@ struct Level {
     SlotTable<TestRun> overflows; ///< some element leaves the range of the destination; null where none can
     /// Copies `bytes` past the caches, for what will not be read soon.
     void (*copyToMemory)(const std::byte* src, std::byte* dst, std::size_t bytes);
+    /// Makes those copies visible in the order of all other writes. To be called once after the last of them.
+    void (*finishCopies)();
 };
 
-/// The table of a class that has these as static templates: convertRun<S, D, rounding, overflow>, surviveRun<S, D>,
-/// overflowRun<S, D, rounding>, and copyToMemory.
+/// The table of a class that makes these with static templates: convertRun<S, D, rounding, overflow>, surviveRun<S, D>,
+/// overflowRun<S, D, rounding>; and copyToMemory, finishCopies.
 template <class Runs> constexpr Level levelOf(const char* name) {
     return {
         .name = name,
         .convert = slotTable<ConvertRun>(
             []<class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>() -> ConvertRun {
-                return &Runs::template convertRun<S, D, rounding, overflow>;
+                return Runs::template convertRun<S, D, rounding, overflow>();
             }),
         .survive = pairTable<TestRun>([]<class S, class D>() -> TestRun {
             if constexpr (holdsEveryValue<S, D>())
                 return nullptr;
             else
-                return &Runs::template surviveRun<S, D>;
+                return Runs::template surviveRun<S, D>();
         }),
         .overflows =
             slotTable<TestRun>([]<class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag>() -> TestRun {
                 if constexpr (canOverflow<S, D>)
-                    return &Runs::template overflowRun<S, D, rounding>;
+                    return Runs::template overflowRun<S, D, rounding>();
                 else
                     return nullptr;
             }),
         .copyToMemory = &Runs::copyToMemory,
+        .finishCopies = &Runs::finishCopies,
     };
 }
 
 extern const Level portableLevel;
+#ifdef __x86_64__
+extern const Level avx2Level;
+extern const Level avx512Level;
+#endif
 
 /// The levels that this processor runs, from the portable one to the widest.
 std::span<const Level* const> availableLevels();

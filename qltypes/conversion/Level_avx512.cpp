@@ -1,0 +1,413 @@
+// The level of processors with AVX-512 (F, BW, DQ, VL): registers of 64 bytes, masks for the ends of a run, and
+// conversions that carry their rounding mode with them.
+#include <immintrin.h>
+
+#include "qltypes/conversion/Kernels_internal.h"
+#include "qltypes/conversion/Levels_internal.h"
+#include "qltypes/conversion/VectorRuns_internal.h"
+
+namespace QLTypeSys::conversion {
+
+namespace {
+
+// Elements travel in integer registers of 64, 32 or 16 bytes; 8 bytes are the lower half of the last.
+//
+// Where a conversion from floating point to integers has no result (NaN, or beyond its range) the processor gives the
+// lowest integer for signed results and the highest for unsigned ones. The steps below rely on it: either that is the
+// wanted end of the range, or its low bytes are, which are all zero for signed results.
+
+inline __m512d floating(double, __m512i bits) { return _mm512_castsi512_pd(bits); }
+inline __m512 floating(float, __m512i bits) { return _mm512_castsi512_ps(bits); }
+inline __m512d all(double v) { return _mm512_set1_pd(v); }
+inline __m512 all(float v) { return _mm512_set1_ps(v); }
+
+// The second operand where either is NaN, or where both are zeros.
+inline __m512d least(__m512d a, __m512d b) { return _mm512_min_pd(a, b); }
+inline __m512 least(__m512 a, __m512 b) { return _mm512_min_ps(a, b); }
+inline __m512d most(__m512d a, __m512d b) { return _mm512_max_pd(a, b); }
+inline __m512 most(__m512 a, __m512 b) { return _mm512_max_ps(a, b); }
+
+template <int relation> __mmask8 lanesWhere(__m512d a, __m512d b) { return _mm512_cmp_pd_mask(a, b, relation); }
+template <int relation> __mmask16 lanesWhere(__m512 a, __m512 b) { return _mm512_cmp_ps_mask(a, b, relation); }
+
+// The direction in which a conversion to integers must round, once withHalf() has prepared the nearest modes.
+template <fxpModeRounding_tag rounding>
+constexpr int directionOf = (rounding == FXP_ROUND_CEILING                                  ? _MM_FROUND_TO_POS_INF
+                             : rounding == FXP_ROUND_FLOOR || rounding == FXP_ROUND_HALF_UP ? _MM_FROUND_TO_NEG_INF
+                             : rounding == FXP_ROUND_HALF_EVEN                              ? _MM_FROUND_TO_NEAREST_INT
+                                                                                            : _MM_FROUND_TO_ZERO) |
+                            _MM_FROUND_NO_EXC;
+constexpr int towardZero = directionOf<FXP_ROUND_ZERO>;
+constexpr int toNearest = directionOf<FXP_ROUND_HALF_EVEN>;
+
+// (a & b) | c of three registers.
+constexpr int andOr = 0xea;
+
+inline __m512d halfWithSignOf(__m512d v) {
+    return _mm512_castsi512_pd(_mm512_ternarylogic_epi64(_mm512_castpd_si512(v), _mm512_castpd_si512(all(-0.0)),
+                                                         _mm512_castpd_si512(all(0.5)), andOr));
+}
+inline __m512 halfWithSignOf(__m512 v) {
+    return _mm512_castsi512_ps(_mm512_ternarylogic_epi32(_mm512_castps_si512(v), _mm512_castps_si512(all(-0.0F)),
+                                                         _mm512_castps_si512(all(0.5F)), andOr));
+}
+
+template <int direction> __m512d sum(__m512d a, __m512d b) { return _mm512_add_round_pd(a, b, direction); }
+template <int direction> __m512 sum(__m512 a, __m512 b) { return _mm512_add_round_ps(a, b, direction); }
+
+// Adds what makes the nearest modes a rounding in one direction. The sum is rounded in that direction too, so it never
+// reaches an integer that the exact sum does not.
+template <class F, fxpModeRounding_tag rounding> auto withHalf(auto v) {
+    if constexpr (rounding == FXP_ROUND_HALF_UP)
+        return sum<directionOf<rounding>>(v, all(F(0.5)));
+    else if constexpr (rounding == FXP_ROUND_HALF_AWAY)
+        return sum<directionOf<rounding>>(v, halfWithSignOf(v));
+    else
+        return v;
+}
+
+// v less a multiple of the modulus, exactly; NaN for infinities. Toward zero the result has the sign of v.
+template <int direction> __m512d remainder(__m512d v, double modulus) {
+    return _mm512_fnmadd_pd(_mm512_roundscale_pd(_mm512_mul_pd(v, all(1 / modulus)), direction), all(modulus), v);
+}
+template <int direction> __m512 remainder(__m512 v, float modulus) {
+    return _mm512_fnmadd_ps(_mm512_roundscale_ps(_mm512_mul_ps(v, all(1 / modulus)), direction), all(modulus), v);
+}
+
+template <int direction> __m256i toInt32(__m512d v) { return _mm512_cvt_roundpd_epi32(v, direction); }
+template <int direction> __m512i toInt32(__m512 v) { return _mm512_cvt_roundps_epi32(v, direction); }
+template <int direction> __m256i toUint32(__m512d v) { return _mm512_cvt_roundpd_epu32(v, direction); }
+template <int direction> __m512i toUint32(__m512 v) { return _mm512_cvt_roundps_epu32(v, direction); }
+template <int direction> __m512i toInt64(__m512d v) { return _mm512_cvt_roundpd_epi64(v, direction); }
+
+// The same where v is a number, and 0 for NaN.
+template <int direction> __m256i numberToInt32(__m512d v) {
+    return _mm512_maskz_cvt_roundpd_epi32(lanesWhere<_CMP_ORD_Q>(v, v), v, direction);
+}
+template <int direction> __m512i numberToInt32(__m512 v) {
+    return _mm512_maskz_cvt_roundps_epi32(lanesWhere<_CMP_ORD_Q>(v, v), v, direction);
+}
+
+// clang-format off
+// Integers of `from` bytes to narrower ones: cut off, or saturating in the signed or unsigned range.
+template <int from, int to> auto cut(auto v) {
+    constexpr bool full = sizeof v == 64;
+    if constexpr (from == to)              return v;
+    else if constexpr (from == 8 && to == 4) return _mm512_cvtepi64_epi32(v);
+    else if constexpr (from == 8 && to == 2) return _mm512_cvtepi64_epi16(v);
+    else if constexpr (from == 8 && to == 1) return _mm512_cvtepi64_epi8(v);
+    else if constexpr (from == 2)            return _mm512_cvtepi16_epi8(v);
+    else if constexpr (to == 2 && full)      return _mm512_cvtepi32_epi16(v);
+    else if constexpr (to == 2)              return _mm256_cvtepi32_epi16(v);
+    else if constexpr (full)                 return _mm512_cvtepi32_epi8(v);
+    else                                     return _mm256_cvtepi32_epi8(v);
+}
+template <int from, int to> auto saturatedSigned(__m512i v) {
+    if constexpr (from == 2)      return _mm512_cvtsepi16_epi8(v);
+    else if constexpr (to == 2)   return _mm512_cvtsepi32_epi16(v);
+    else                          return _mm512_cvtsepi32_epi8(v);
+}
+template <int from, int to> auto saturatedUnsigned(auto v) {
+    constexpr bool full = sizeof v == 64;
+    if constexpr (from == to)              return v;
+    else if constexpr (from == 2)            return _mm512_cvtusepi16_epi8(v);
+    else if constexpr (to == 2 && full)      return _mm512_cvtusepi32_epi16(v);
+    else if constexpr (to == 2)              return _mm256_cvtusepi32_epi16(v);
+    else if constexpr (full)                 return _mm512_cvtusepi32_epi8(v);
+    else                                     return _mm256_cvtusepi32_epi8(v);
+}
+
+// Elements of an integer type to integers of `to` bytes, eight of them or a full register.
+template <class S, int to, int lanes> auto widened(auto v) {
+    constexpr bool isSigned = std::is_signed_v<S>;
+    if constexpr (sizeof(S) == to)                return v;
+    else if constexpr (to == 2 && isSigned)         return _mm512_cvtepi8_epi16(v);
+    else if constexpr (to == 2)                     return _mm512_cvtepu8_epi16(v);
+    else if constexpr (lanes == 16 && sizeof(S) == 1) return isSigned ? _mm512_cvtepi8_epi32(v) : _mm512_cvtepu8_epi32(v);
+    else if constexpr (lanes == 16)                 return isSigned ? _mm512_cvtepi16_epi32(v) : _mm512_cvtepu16_epi32(v);
+    else if constexpr (sizeof(S) == 1)              return isSigned ? _mm256_cvtepi8_epi32(v) : _mm256_cvtepu8_epi32(v);
+    else                                          return isSigned ? _mm256_cvtepi16_epi32(v) : _mm256_cvtepu16_epi32(v);
+}
+
+// Lanes of `size` bytes.
+template <int size> __m512i allLanes(std::uint32_t v) {
+    if constexpr (size == 4)      return _mm512_set1_epi32(static_cast<int>(v));
+    else if constexpr (size == 2) return _mm512_set1_epi16(static_cast<short>(v));
+    else                          return _mm512_set1_epi8(static_cast<char>(v));
+}
+template <int size> __m512i mostSigned(__m512i a, __m512i b) {
+    if constexpr (size == 4)      return _mm512_max_epi32(a, b);
+    else if constexpr (size == 2) return _mm512_max_epi16(a, b);
+    else                          return _mm512_max_epi8(a, b);
+}
+template <int size> __m512i leastUnsigned(__m512i a, __m512i b) {
+    if constexpr (size == 4)      return _mm512_min_epu32(a, b);
+    else if constexpr (size == 2) return _mm512_min_epu16(a, b);
+    else                          return _mm512_min_epu8(a, b);
+}
+// clang-format on
+
+template <class D, fxpModeRounding_tag rounding, class F> auto saturated(F, auto v) {
+    constexpr int direction = directionOf<rounding>;
+    constexpr F hi = static_cast<F>(highest<D>), lo = static_cast<F>(lowest<D>);
+    if constexpr (std::is_unsigned_v<D>) {
+        // NaN becomes 0 with the negative values; what is beyond 32 bits becomes the highest.
+        const auto atLeastZero = withHalf<F, rounding>(most(v, all(F(0))));
+        return saturatedUnsigned<4, sizeof(D)>(toUint32<direction>(atLeastZero));
+    } else if constexpr (sizeof(D) < 4) {
+        return cut<4, sizeof(D)>(toInt32<direction>(withHalf<F, rounding>(least(all(hi), most(all(lo), v)))));
+    } else if constexpr (std::is_same_v<F, double>) {
+        // What is too low becomes the lowest.
+        return numberToInt32<direction>(withHalf<F, rounding>(least(all(hi), v)));
+    } else {
+        // hi is 2^31 here, beyond what converts.
+        const __m512i number = numberToInt32<direction>(withHalf<F, rounding>(v));
+        return _mm512_mask_mov_epi32(number, lanesWhere<_CMP_GE_OQ>(v, all(hi)), allLanes<4>(highest<D>));
+    }
+}
+
+template <class D, fxpModeRounding_tag rounding, class F> auto wrapped(F, auto v) {
+    constexpr int direction = directionOf<rounding>;
+    constexpr F modulusOfD = static_cast<F>(modulus<D>);
+    if constexpr (std::is_same_v<F, double>) {
+        // Beyond 64 bits the low byte of every double is zero.
+        if constexpr (sizeof(D) > 1) v = remainder<towardZero>(v, modulusOfD);
+        return cut<8, sizeof(D)>(toInt64<direction>(withHalf<F, rounding>(v)));
+    } else if constexpr (sizeof(D) == 4) {
+        // Values with a fraction stay as they are; 2^31 gives the bits that it should.
+        v = remainder<toNearest>(v, modulusOfD);
+        return numberToInt32<direction>(withHalf<F, rounding>(v));
+    } else {
+        // Beyond 32 bits the low byte of every single is zero.
+        if constexpr (sizeof(D) > 1) v = remainder<towardZero>(v, modulusOfD);
+        return cut<4, sizeof(D)>(toInt32<direction>(withHalf<F, rounding>(v)));
+    }
+}
+
+template <class S> auto toBoolean(__m512i v) {
+    if constexpr (std::is_same_v<S, double>)
+        return _mm_maskz_set1_epi8(_mm512_test_epi64_mask(v, _mm512_set1_epi64(INT64_MAX)), 1);
+    else if constexpr (std::is_same_v<S, float>)
+        return _mm_maskz_set1_epi8(_mm512_test_epi32_mask(v, _mm512_set1_epi32(INT32_MAX)), 1);
+    else
+        return cut<sizeof(S), 1>(leastUnsigned<sizeof(S)>(v, allLanes<sizeof(S)>(1)));
+}
+
+template <class S, class D> auto toFloating(auto v) {
+    if constexpr (std::is_same_v<S, double>)
+        return _mm256_castps_si256(_mm512_cvtpd_ps(_mm512_castsi512_pd(v)));
+    else if constexpr (std::is_same_v<S, float>)
+        return _mm512_castpd_si512(_mm512_cvtps_pd(_mm256_castsi256_ps(v)));
+    else if constexpr (std::is_same_v<D, double>)
+        return _mm512_castpd_si512(std::is_same_v<S, std::uint32_t> ? _mm512_cvtepu32_pd(widened<S, 4, 8>(v))
+                                                                    : _mm512_cvtepi32_pd(widened<S, 4, 8>(v)));
+    else
+        return _mm512_castps_si512(std::is_same_v<S, std::uint32_t> ? _mm512_cvtepu32_ps(widened<S, 4, 16>(v))
+                                                                    : _mm512_cvtepi32_ps(widened<S, 4, 16>(v)));
+}
+
+template <class S, class D, fxpModeOverflow_tag overflow> auto toInteger(auto v) {
+    constexpr bool saturates = overflowMatters<S, D> && overflow == FXP_OVERFLOW_SATURATE;
+    constexpr int from = sizeof(S), to = sizeof(D);
+    if constexpr (to > from) {
+        const __m512i wide = widened<S, to, 64 / to>(v);
+        if constexpr (saturates)
+            return mostSigned<to>(wide, __m512i{});
+        else
+            return wide;
+    } else if constexpr (!saturates) {
+        return cut<from, to>(v);
+    } else if constexpr (std::is_unsigned_v<S> && std::is_signed_v<D>) {
+        return cut<from, to>(leastUnsigned<from>(v, allLanes<from>(highest<D>)));
+    } else if constexpr (std::is_signed_v<D>) {
+        return saturatedSigned<from, to>(v);
+    } else if constexpr (std::is_signed_v<S>) {
+        return saturatedUnsigned<from, to>(mostSigned<from>(v, __m512i{}));
+    } else {
+        return saturatedUnsigned<from, to>(v);
+    }
+}
+
+// Notes of losses and overflows. note() takes a register of source elements, any() speaks of all of them.
+
+inline __m512i signsSpread32(__m512i v) { return _mm512_srai_epi32(v, 31); }
+inline __m256i signsSpread32(__m256i v) { return _mm256_srai_epi32(v, 31); }
+inline bool anyBit(__m512i v, std::uint32_t bits) { return _mm512_test_epi32_mask(v, allLanes<4>(bits)) != 0; }
+inline bool anyBit(__m256i v, std::uint32_t bits) {
+    return _mm256_test_epi32_mask(v, _mm256_set1_epi32(static_cast<int>(bits))) != 0;
+}
+
+// Integers are outside a range when they have a bit that no number of the range has. Where both types are signed the
+// bits that count are those that differ from the sign.
+template <class S, class D> class BitsOutside {
+  public:
+    void note(__m512i v) {
+        if constexpr (std::is_unsigned_v<S> || std::is_unsigned_v<D> || isBoolean<D>)
+            found_ |= v;
+        else if constexpr (sizeof(S) == 4)
+            found_ |= v ^ signsSpread32(v);
+        else
+            found_ |= v ^ _mm512_srai_epi16(v, 15);
+    }
+    bool any() const { return _mm512_test_epi32_mask(found_, allLanes<sizeof(S)>(outside)) != 0; }
+
+  private:
+    static constexpr std::uint32_t outside = ~static_cast<std::uint32_t>(largestCommon<S, D>());
+    __m512i found_{};
+};
+
+// 32-bit integers to single, there and back.
+template <class S> class SinglesThatDiffer {
+  public:
+    void note(__m512i v) {
+        if constexpr (std::is_signed_v<S>) // 2^31, next to the highest, comes back as the lowest
+            differences_ |= v ^ _mm512_cvttps_epi32(_mm512_cvtepi32_ps(v));
+        else // rounded toward zero, or 2^32 would come back as the highest
+            differences_ |= v ^ _mm512_cvttps_epu32(_mm512_cvt_roundepu32_ps(v, towardZero));
+    }
+    bool any() const { return anyBit(differences_, ~0U); }
+
+  private:
+    __m512i differences_{};
+};
+
+// Floating elements to another type, there and back toward zero.
+template <class F, class D> class FloatingLosses {
+  public:
+    void note(__m512i bits) {
+        const auto v = floating(F{}, bits);
+        if constexpr (isBoolean<D>)
+            lost_ |= lanesWhere<_CMP_NEQ_UQ>(v, all(F(0))) & lanesWhere<_CMP_NEQ_UQ>(v, all(F(1)));
+        else if constexpr (isFloating<D>)
+            lost_ |= lanesWhere<_CMP_NEQ_UQ>(v, _mm512_cvtps_pd(_mm512_cvtpd_ps(v)));
+        else if constexpr (std::is_unsigned_v<D>)
+            compare(v, toUint32<towardZero>(v));
+        else
+            compare(v, toInt32<towardZero>(v));
+    }
+    bool any() const {
+        if (lost_) return true;
+        if constexpr (isInteger<D> && sizeof(D) < 4)
+            return anyBit(outside_, ~std::uint32_t{highest<D>});
+        else
+            return false;
+    }
+
+  private:
+    void compare(auto v, auto whole) {
+        lost_ |= lanesWhere<_CMP_NEQ_UQ>(v, back(whole));
+        if constexpr (std::is_unsigned_v<D>)
+            outside_ |= whole;
+        else
+            outside_ |= whole ^ signsSpread32(whole);
+    }
+    static __m512d back(__m256i whole) {
+        return std::is_unsigned_v<D> ? _mm512_cvtepu32_pd(whole) : _mm512_cvtepi32_pd(whole);
+    }
+    static __m512 back(__m512i whole) { // toward zero, so that no end of a range comes back as a power of two
+        return std::is_unsigned_v<D> ? _mm512_cvt_roundepu32_ps(whole, towardZero)
+                                     : _mm512_cvt_roundepi32_ps(whole, towardZero);
+    }
+
+    decltype(lanesWhere<_CMP_NEQ_UQ>(all(F{}), all(F{}))) lost_ = 0;
+    decltype(toInt32<towardZero>(all(F{}))) outside_{};
+};
+
+template <class F, class D, fxpModeRounding_tag rounding> class FloatingOverflows {
+  public:
+    void note(__m512i bits) {
+        const auto v = floating(F{}, bits);
+        if constexpr (isFloating<D>) {
+            const __m512d magnitude = _mm512_abs_pd(v);
+            outside_ |= lanesWhere<_CMP_GE_OQ>(magnitude, all(infiniteAsSingleFrom)) &
+                        lanesWhere<_CMP_LE_OQ>(magnitude, all(largestDouble));
+        } else {
+            constexpr OverflowBounds<F> bounds = overflowBounds<F, D, rounding>();
+            outside_ |= lanesWhere < bounds.aboveIsOutside ? _CMP_GE_OQ
+                        : _CMP_GT_OQ > (v, all(bounds.above)) | lanesWhere < bounds.belowIsOutside
+                            ? _CMP_LE_OQ
+                            : _CMP_LT_OQ > (v, all(bounds.below));
+        }
+    }
+    bool any() const { return outside_ != 0; }
+
+  private:
+    decltype(lanesWhere<_CMP_GE_OQ>(all(F{}), all(F{}))) outside_ = 0;
+};
+
+struct Avx512 {
+    static constexpr std::size_t registerBytes = 64;
+
+    // clang-format off
+    template <std::size_t bytes> static auto load(const std::byte* p) {
+        if constexpr (bytes == 64)      return _mm512_loadu_si512(p);
+        else if constexpr (bytes == 32) return _mm256_loadu_si256(reinterpret_cast<const __m256i_u*>(p));
+        else if constexpr (bytes == 16) return _mm_loadu_si128(reinterpret_cast<const __m128i_u*>(p));
+        else                            return _mm_loadu_si64(p);
+    }
+    template <std::size_t bytes> static auto load(const std::byte* p, std::size_t used) {
+        const __mmask64 mask = (__mmask64{1} << used) - 1;
+        if constexpr (bytes == 64)      return _mm512_maskz_loadu_epi8(mask, p);
+        else if constexpr (bytes == 32) return _mm256_maskz_loadu_epi8(static_cast<__mmask32>(mask), p);
+        else                            return _mm_maskz_loadu_epi8(static_cast<__mmask16>(mask), p);
+    }
+    template <std::size_t bytes> static void store(std::byte* p, auto v) {
+        if constexpr (bytes == 64)      _mm512_storeu_si512(p, v);
+        else if constexpr (bytes == 32) _mm256_storeu_si256(reinterpret_cast<__m256i_u*>(p), v);
+        else if constexpr (bytes == 16) _mm_storeu_si128(reinterpret_cast<__m128i_u*>(p), v);
+        else                            _mm_storeu_si64(p, v);
+    }
+    template <std::size_t bytes> static void store(std::byte* p, auto v, std::size_t used) {
+        const __mmask64 mask = (__mmask64{1} << used) - 1;
+        if constexpr (bytes == 64)      _mm512_mask_storeu_epi8(p, mask, v);
+        else if constexpr (bytes == 32) _mm256_mask_storeu_epi8(p, static_cast<__mmask32>(mask), v);
+        else                            _mm_mask_storeu_epi8(p, static_cast<__mmask16>(mask), v);
+    }
+    // clang-format on
+
+    template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
+    static auto converted(auto v) {
+        if constexpr (isBoolean<D>)
+            return toBoolean<S>(v);
+        else if constexpr (isFloating<D>)
+            return toFloating<S, D>(v);
+        else if constexpr (isInteger<S>)
+            return toInteger<S, D, overflow>(v);
+        else if constexpr (overflow == FXP_OVERFLOW_SATURATE)
+            return saturated<D, rounding>(S{}, floating(S{}, v));
+        else
+            return wrapped<D, rounding>(S{}, floating(S{}, v));
+    }
+
+    template <class S, class D>
+    using Losses = std::conditional_t<isFloating<S>, FloatingLosses<S, D>,
+                                      std::conditional_t<isFloating<D>, SinglesThatDiffer<S>, BitsOutside<S, D>>>;
+
+    template <class S, class D, fxpModeRounding_tag rounding>
+    using Overflows = std::conditional_t<isFloating<S>, FloatingOverflows<S, D, rounding>, BitsOutside<S, D>>;
+
+    // Whole lines past the caches; what is left of a line at either end as usual.
+    static void copyToMemory(const std::byte* src, std::byte* dst, std::size_t bytes) {
+        const std::size_t head = -reinterpret_cast<std::uintptr_t>(dst) % registerBytes;
+        if (head) {
+            const std::size_t used = head < bytes ? head : bytes;
+            store<registerBytes>(dst, load<registerBytes>(src, used), used);
+            src += used;
+            dst += used;
+            bytes -= used;
+        }
+        for (; bytes >= registerBytes; bytes -= registerBytes) {
+            _mm512_stream_si512(reinterpret_cast<__m512i*>(dst), load<registerBytes>(src));
+            src += registerBytes;
+            dst += registerBytes;
+        }
+        if (bytes) store<registerBytes>(dst, load<registerBytes>(src, bytes), bytes);
+    }
+    static void finishCopies() { _mm_sfence(); }
+};
+
+} // namespace
+
+constinit const Level avx512Level = levelOf<VectorRuns<Avx512>>("avx512");
+
+} // namespace QLTypeSys::conversion
