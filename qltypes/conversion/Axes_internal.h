@@ -38,7 +38,7 @@ template <class T> inline constexpr bool isInteger = std::is_integral_v<T>;
 template <class T> inline constexpr bool isBoolean = std::is_same_v<T, Boolean>;
 
 /// True when no value of S is lost in D, whatever the modes. Such cells have nothing to check.
-template <class S, class D> constexpr bool holdsEveryValue() {
+template <class S, class D> consteval bool holdsEveryValue() {
     if constexpr (std::is_same_v<S, D> || isBoolean<S>)
         return true; // kept: a boolean byte above 127 becomes a negative int8, and that is not reported
     else if constexpr (isBoolean<D> || (isFloating<S> && isInteger<D>))

@@ -18,8 +18,14 @@ namespace QLTypeSys::conversion {
 template <class D> inline constexpr D lowest = std::numeric_limits<D>::min();
 template <class D> inline constexpr D highest = std::numeric_limits<D>::max();
 
+/// The highest value of the floating type F that is in the range of D.
+template <class F, class D>
+inline constexpr F highestIn = std::numeric_limits<F>::digits >= std::numeric_limits<D>::digits
+                                   ? static_cast<F>(highest<D>)
+                                   : static_cast<F>(highest<D> - (highest<D> >> std::numeric_limits<F>::digits));
+
 /// The highest value that both types have; of a boolean, 1.
-template <class S, class D> constexpr auto largestCommon() {
+template <class S, class D> consteval auto largestCommon() {
     if constexpr (isBoolean<D>)
         return S{1};
     else
@@ -102,7 +108,7 @@ template <class F> struct OverflowBounds {
     bool belowIsOutside;
 };
 
-template <class S, class D, fxpModeRounding_tag rounding> constexpr OverflowBounds<S> overflowBounds() {
+template <class S, class D, fxpModeRounding_tag rounding> consteval OverflowBounds<S> overflowBounds() {
     // kept: in single precision the bounds of 32-bit types are themselves rounded, which moves the inclusive ones
     constexpr auto bounds = [](double above, double below, bool aboveIsOutside, bool belowIsOutside) {
         return OverflowBounds<S>{static_cast<S>(highest<D> + above), static_cast<S>(lowest<D> - below), aboveIsOutside,

@@ -74,6 +74,9 @@ template <int direction> __m512 remainder(__m512 v, float modulus) {
     return _mm512_fnmadd_ps(_mm512_roundscale_ps(_mm512_mul_ps(v, all(1 / modulus)), direction), all(modulus), v);
 }
 
+inline __m512d integral(__m512d v) { return _mm512_roundscale_pd(v, towardZero); }
+inline __m512 integral(__m512 v) { return _mm512_roundscale_ps(v, towardZero); }
+
 template <int direction> __m256i toInt32(__m512d v) { return _mm512_cvt_roundpd_epi32(v, direction); }
 template <int direction> __m512i toInt32(__m512 v) { return _mm512_cvt_roundps_epi32(v, direction); }
 template <int direction> __m256i toUint32(__m512d v) { return _mm512_cvt_roundpd_epu32(v, direction); }
@@ -228,115 +231,9 @@ template <class S, class D, fxpModeOverflow_tag overflow> auto toInteger(auto v)
     }
 }
 
-// Notes of losses and overflows. note() takes a register of source elements, any() speaks of all of them.
-
-inline __m512i signsSpread32(__m512i v) { return _mm512_srai_epi32(v, 31); }
-inline __m256i signsSpread32(__m256i v) { return _mm256_srai_epi32(v, 31); }
-inline bool anyBit(__m512i v, std::uint32_t bits) { return _mm512_test_epi32_mask(v, allLanes<4>(bits)) != 0; }
-inline bool anyBit(__m256i v, std::uint32_t bits) {
-    return _mm256_test_epi32_mask(v, _mm256_set1_epi32(static_cast<int>(bits))) != 0;
-}
-
-// Integers are outside a range when they have a bit that no number of the range has. Where both types are signed the
-// bits that count are those that differ from the sign.
-template <class S, class D> class BitsOutside {
-  public:
-    void note(__m512i v) {
-        if constexpr (std::is_unsigned_v<S> || std::is_unsigned_v<D> || isBoolean<D>)
-            found_ |= v;
-        else if constexpr (sizeof(S) == 4)
-            found_ |= v ^ signsSpread32(v);
-        else
-            found_ |= v ^ _mm512_srai_epi16(v, 15);
-    }
-    bool any() const { return _mm512_test_epi32_mask(found_, allLanes<sizeof(S)>(outside)) != 0; }
-
-  private:
-    static constexpr std::uint32_t outside = ~static_cast<std::uint32_t>(largestCommon<S, D>());
-    __m512i found_{};
-};
-
-// 32-bit integers to single, there and back.
-template <class S> class SinglesThatDiffer {
-  public:
-    void note(__m512i v) {
-        if constexpr (std::is_signed_v<S>) // 2^31, next to the highest, comes back as the lowest
-            differences_ |= v ^ _mm512_cvttps_epi32(_mm512_cvtepi32_ps(v));
-        else // rounded toward zero, or 2^32 would come back as the highest
-            differences_ |= v ^ _mm512_cvttps_epu32(_mm512_cvt_roundepu32_ps(v, towardZero));
-    }
-    bool any() const { return anyBit(differences_, ~0U); }
-
-  private:
-    __m512i differences_{};
-};
-
-// Floating elements to another type, there and back toward zero.
-template <class F, class D> class FloatingLosses {
-  public:
-    void note(__m512i bits) {
-        const auto v = floating(F{}, bits);
-        if constexpr (isBoolean<D>)
-            lost_ |= lanesWhere<_CMP_NEQ_UQ>(v, all(F(0))) & lanesWhere<_CMP_NEQ_UQ>(v, all(F(1)));
-        else if constexpr (isFloating<D>)
-            lost_ |= lanesWhere<_CMP_NEQ_UQ>(v, _mm512_cvtps_pd(_mm512_cvtpd_ps(v)));
-        else if constexpr (std::is_unsigned_v<D>)
-            compare(v, toUint32<towardZero>(v));
-        else
-            compare(v, toInt32<towardZero>(v));
-    }
-    bool any() const {
-        if (lost_) return true;
-        if constexpr (isInteger<D> && sizeof(D) < 4)
-            return anyBit(outside_, ~std::uint32_t{highest<D>});
-        else
-            return false;
-    }
-
-  private:
-    void compare(auto v, auto whole) {
-        lost_ |= lanesWhere<_CMP_NEQ_UQ>(v, back(whole));
-        if constexpr (std::is_unsigned_v<D>)
-            outside_ |= whole;
-        else
-            outside_ |= whole ^ signsSpread32(whole);
-    }
-    static __m512d back(__m256i whole) {
-        return std::is_unsigned_v<D> ? _mm512_cvtepu32_pd(whole) : _mm512_cvtepi32_pd(whole);
-    }
-    static __m512 back(__m512i whole) { // toward zero, so that no end of a range comes back as a power of two
-        return std::is_unsigned_v<D> ? _mm512_cvt_roundepu32_ps(whole, towardZero)
-                                     : _mm512_cvt_roundepi32_ps(whole, towardZero);
-    }
-
-    decltype(lanesWhere<_CMP_NEQ_UQ>(all(F{}), all(F{}))) lost_ = 0;
-    decltype(toInt32<towardZero>(all(F{}))) outside_{};
-};
-
-template <class F, class D, fxpModeRounding_tag rounding> class FloatingOverflows {
-  public:
-    void note(__m512i bits) {
-        const auto v = floating(F{}, bits);
-        if constexpr (isFloating<D>) {
-            const __m512d magnitude = _mm512_abs_pd(v);
-            outside_ |= lanesWhere<_CMP_GE_OQ>(magnitude, all(infiniteAsSingleFrom)) &
-                        lanesWhere<_CMP_LE_OQ>(magnitude, all(largestDouble));
-        } else {
-            constexpr OverflowBounds<F> bounds = overflowBounds<F, D, rounding>();
-            outside_ |= lanesWhere < bounds.aboveIsOutside ? _CMP_GE_OQ
-                        : _CMP_GT_OQ > (v, all(bounds.above)) | lanesWhere < bounds.belowIsOutside
-                            ? _CMP_LE_OQ
-                            : _CMP_LT_OQ > (v, all(bounds.below));
-        }
-    }
-    bool any() const { return outside_ != 0; }
-
-  private:
-    decltype(lanesWhere<_CMP_GE_OQ>(all(F{}), all(F{}))) outside_ = 0;
-};
-
 struct Avx512 {
     static constexpr std::size_t registerBytes = 64;
+    using Bits = __m512i;
 
     // clang-format off
     template <std::size_t bytes> static auto load(const std::byte* p) {
@@ -379,23 +276,40 @@ struct Avx512 {
             return wrapped<D, rounding>(S{}, floating(S{}, v));
     }
 
-    template <class S, class D>
-    using Losses = std::conditional_t<isFloating<S>, FloatingLosses<S, D>,
-                                      std::conditional_t<isFloating<D>, SinglesThatDiffer<S>, BitsOutside<S, D>>>;
-
-    template <class S, class D, fxpModeRounding_tag rounding>
-    using Overflows = std::conditional_t<isFloating<S>, FloatingOverflows<S, D, rounding>, BitsOutside<S, D>>;
+    // Tests of a register: lanes as a mask, or the bits that differ.
+    static auto floating(auto f, __m512i bits) { return conversion::floating(f, bits); }
+    template <int relation, class F> static auto lanesWhere(auto v, F bound) {
+        return conversion::lanesWhere<relation>(v, all(bound));
+    }
+    template <class F> static auto unlikeTruncated(auto v, F lo, F hi) {
+        return conversion::lanesWhere<_CMP_NEQ_UQ>(v, integral(least(all(hi), most(all(lo), v))));
+    }
+    static auto unlikeSingle(__m512d v) {
+        return conversion::lanesWhere<_CMP_NEQ_UQ>(v, _mm512_cvtps_pd(_mm512_cvtpd_ps(v)));
+    }
+    template <class S> static __m512i unlikeSingle(S, __m512i v) {
+        if constexpr (std::is_signed_v<S>) // 2^31, next to the highest, comes back as the lowest
+            return v ^ _mm512_cvttps_epi32(_mm512_cvtepi32_ps(v));
+        else // rounded toward zero, or 2^32 would come back as the highest
+            return v ^ _mm512_cvttps_epu32(_mm512_cvt_roundepu32_ps(v, towardZero));
+    }
+    template <int size> static __m512i signs(__m512i v) {
+        return size == 4 ? _mm512_srai_epi32(v, 31) : _mm512_srai_epi16(v, 15);
+    }
+    template <int size> static bool anyBit(__m512i v, std::uint32_t bits) {
+        return _mm512_test_epi32_mask(v, allLanes<size>(bits)) != 0;
+    }
+    static __m512d magnitude(__m512d v) { return _mm512_abs_pd(v); }
+    static bool any(auto mask) { return mask != 0; }
 
     // Whole lines past the caches; what is left of a line at either end as usual.
     static void copyToMemory(const std::byte* src, std::byte* dst, std::size_t bytes) {
-        const std::size_t head = -reinterpret_cast<std::uintptr_t>(dst) % registerBytes;
-        if (head) {
-            const std::size_t used = head < bytes ? head : bytes;
-            store<registerBytes>(dst, load<registerBytes>(src, used), used);
-            src += used;
-            dst += used;
-            bytes -= used;
-        }
+        const std::size_t unaligned = -reinterpret_cast<std::uintptr_t>(dst) % registerBytes;
+        const std::size_t head = unaligned < bytes ? unaligned : bytes;
+        if (head) store<registerBytes>(dst, load<registerBytes>(src, head), head);
+        src += head;
+        dst += head;
+        bytes -= head;
         for (; bytes >= registerBytes; bytes -= registerBytes) {
             _mm512_stream_si512(reinterpret_cast<__m512i*>(dst), load<registerBytes>(src));
             src += registerBytes;

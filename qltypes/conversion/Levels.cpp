@@ -9,13 +9,13 @@ constinit std::size_t cachedBytes = std::size_t{32} << 20;
 
 std::span<const Level* const> availableLevels() {
 #ifdef __x86_64__
-    static constexpr const Level* levels[] = {&portableLevel, &avx512Level};
+    static constexpr const Level* levels[] = {&portableLevel, &avx2Level, &avx512Level};
     const auto supported = [] {
         __builtin_cpu_init();
         if (!__builtin_cpu_supports("avx2") || !__builtin_cpu_supports("fma")) return 1;
         const bool all512 = __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") &&
                             __builtin_cpu_supports("avx512dq") && __builtin_cpu_supports("avx512vl");
-        return all512 ? 2 : 1;
+        return all512 ? 3 : 2;
     };
     return std::span(levels).first(static_cast<std::size_t>(supported()));
 #else

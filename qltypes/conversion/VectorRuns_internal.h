@@ -1,13 +1,18 @@
-// The loops over whole registers, the same for every vector level.
+// The loops over whole registers and the notes they take, the same for every vector level.
 //
 // `Vectors` is the set of operations of one instruction set. It is a class of an unnamed namespace, so that what is
-// compiled for one processor is never taken for another. It provides:
+// compiled for one processor is never taken for another. It provides, F being double or float:
 //
-//   registerBytes                                     the width of its registers
-//   load<bytes>(p), load<bytes>(p, used)              a register of `bytes`; the second reads `used` and fills with
-//   zeros store<bytes>(p, register), ...(p, register, used) converted<S, D, rounding, overflow>(register)     elements
-//   of S to as many elements of D Losses<S, D>, Overflows<S, D, rounding>           note a register; any() tells
-//   whether one of its elements is so copyToMemory(src, dst, bytes), finishCopies()
+//   registerBytes, Bits                               the width of its registers, and one of them
+//   load<bytes>(p), load<bytes>(p, used)              a register of `bytes`; the second reads `used`, the rest is zero
+//   store<bytes>(p, v), store<bytes>(p, v, used)
+//   converted<S, D, rounding, overflow>(v)            elements of S to as many elements of D
+//   floating(F{}, bits), magnitude(v)                 a whole register as floating elements
+//   lanesWhere<relation>(v, bound)                    a mask; masks combine with & and |, any(mask) asks
+//   unlikeTruncated(v, lo, hi), unlikeSingle(v)       a mask: not an integer from lo to hi; not a single
+//   unlikeSingle(S{}, bits)                           bits that differ once the integers have been singles
+//   signs<size>(bits), anyBit<size>(bits, some)       lanes filled with their sign; whether a lane has one of some bits
+//   copyToMemory(src, dst, bytes), finishCopies()     as in Level
 //
 // The bits of a register that stand for no element of a run are zero, which is lost nowhere and overflows nothing.
 #pragma once
@@ -18,7 +23,9 @@
 #include <type_traits>
 #include <utility>
 
-#include "qltypes/conversion/Axes_internal.h"
+#include <immintrin.h>
+
+#include "qltypes/conversion/Kernels_internal.h"
 #include "qltypes/conversion/Levels_internal.h"
 
 namespace QLTypeSys::conversion {
@@ -36,6 +43,74 @@ template <class S, class D, fxpModeOverflow_tag overflow> struct SameBits {
     using Dst = typename std::conditional_t<!saturates && isInteger<D>, UnsignedOf<D>, std::type_identity<D>>::type;
 };
 
+// Notes of losses and overflows: note() takes a register of source elements, any() speaks of all that were noted.
+
+/// Integers are outside a range when they have a bit that no number of the range has. Where both types are signed the
+/// bits that count are those that differ from the sign.
+template <class Vectors, class S, class D> class IntegersOutside {
+  public:
+    void note(typename Vectors::Bits v) {
+        if constexpr (std::is_signed_v<S> && std::is_signed_v<D>)
+            found_ |= v ^ Vectors::template signs<sizeof(S)>(v);
+        else
+            found_ |= v;
+    }
+    bool any() const {
+        return Vectors::template anyBit<sizeof(S)>(found_, ~static_cast<std::uint32_t>(largestCommon<S, D>()));
+    }
+
+  private:
+    typename Vectors::Bits found_{};
+};
+
+/// 32-bit integers that a single does not hold.
+template <class Vectors, class S> class IntegersUnlikeSingles {
+  public:
+    void note(typename Vectors::Bits v) { differences_ |= Vectors::unlikeSingle(S{}, v); }
+    bool any() const { return Vectors::template anyBit<4>(differences_, ~std::uint32_t{0}); }
+
+  private:
+    typename Vectors::Bits differences_{};
+};
+
+/// Floating elements for which a rule gives a mask.
+template <class Vectors, class F, class Rule> class FloatingLanes {
+  public:
+    void note(typename Vectors::Bits v) { found_ |= Rule::lanes(Vectors::floating(F{}, v)); }
+    bool any() const { return Vectors::any(found_); }
+
+  private:
+    decltype(Rule::lanes(Vectors::floating(F{}, typename Vectors::Bits{}))) found_{};
+};
+
+template <class Vectors, class F, class D> struct LossRule {
+    static auto lanes(auto v) {
+        if constexpr (isBoolean<D>)
+            return Vectors::template lanesWhere<_CMP_NEQ_UQ>(v, F(0)) &
+                   Vectors::template lanesWhere<_CMP_NEQ_UQ>(v, F(1));
+        else if constexpr (isFloating<D>)
+            return Vectors::unlikeSingle(v);
+        else
+            return Vectors::unlikeTruncated(v, static_cast<F>(lowest<D>), highestIn<F, D>);
+    }
+};
+
+template <class Vectors, class F, class D, fxpModeRounding_tag rounding> struct OverflowRule {
+    static auto lanes(auto v) {
+        if constexpr (isFloating<D>) {
+            const auto magnitude = Vectors::magnitude(v);
+            return Vectors::template lanesWhere<_CMP_GE_OQ>(magnitude, infiniteAsSingleFrom) &
+                   Vectors::template lanesWhere<_CMP_LE_OQ>(magnitude, largestDouble);
+        } else {
+            constexpr OverflowBounds<F> bounds = overflowBounds<F, D, rounding>();
+            constexpr int aboveRelation = bounds.aboveIsOutside ? _CMP_GE_OQ : _CMP_GT_OQ;
+            constexpr int belowRelation = bounds.belowIsOutside ? _CMP_LE_OQ : _CMP_LT_OQ;
+            return Vectors::template lanesWhere<aboveRelation>(v, bounds.above) |
+                   Vectors::template lanesWhere<belowRelation>(v, bounds.below);
+        }
+    }
+};
+
 template <class Vectors> struct VectorRuns {
     /// Registers that are handled between two tests of the loop's end.
     static constexpr std::size_t unrolled = 4;
@@ -50,13 +125,11 @@ template <class Vectors> struct VectorRuns {
     }
 
     template <class S, class D> static constexpr TestRun surviveRun() {
-        return [](const std::byte* src, std::size_t count) {
-            return !anyNoted<typename Vectors::template Losses<S, D>, S>(src, count);
-        };
+        return [](const std::byte* src, std::size_t count) { return !anyNoted<Losses<S, D>, S>(src, count); };
     }
 
     template <class S, class D, fxpModeRounding_tag rounding> static constexpr TestRun overflowRun() {
-        return &anyNoted<typename Vectors::template Overflows<S, D, rounding>, S>;
+        return &anyNoted<Overflows<S, D, rounding>, S>;
     }
 
     static void copyToMemory(const std::byte* src, std::byte* dst, std::size_t bytes) {
@@ -65,6 +138,17 @@ template <class Vectors> struct VectorRuns {
     static void finishCopies() { Vectors::finishCopies(); }
 
   private:
+    template <class S, class D>
+    using LossesOfIntegers =
+        std::conditional_t<isFloating<D>, IntegersUnlikeSingles<Vectors, S>, IntegersOutside<Vectors, S, D>>;
+    template <class S, class D>
+    using Losses =
+        std::conditional_t<isFloating<S>, FloatingLanes<Vectors, S, LossRule<Vectors, S, D>>, LossesOfIntegers<S, D>>;
+    template <class S, class D, fxpModeRounding_tag rounding>
+    using Overflows =
+        std::conditional_t<isFloating<S>, FloatingLanes<Vectors, S, OverflowRule<Vectors, S, D, rounding>>,
+                           IntegersOutside<Vectors, S, D>>;
+
     template <std::size_t size> static void copyRun(const std::byte* src, std::byte* dst, std::size_t count) {
         std::memmove(dst, src, count * size);
     }
