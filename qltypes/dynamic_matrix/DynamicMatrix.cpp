@@ -142,7 +142,9 @@ void DynamicMatrix::getDataDimsFcn(const void* matrix, unsigned long* dims) {
 void DynamicMatrix::updateDataDimsFcn(unsigned long numDims, const unsigned long* dims, unsigned long elementSize,
                                       void* matrix) {
     DynamicMatrix& m = matrixAt(matrix);
-    if (!m.rawData)
+    // A copy of a source that was never shaped has a buffer, of no bytes, and no dimensions: setDims would only shape it.
+    const bool isUnshaped = m.dims.empty() && numDims > 0;
+    if (!m.rawData || isUnshaped)
         dataConstructFcn(numDims, dims, elementSize, nullptr, matrix);
     else if (!hasDims(m, numDims, dims)) // the answer of setDims, without the vector
         m.setDims(decoded(numDims, dims));

@@ -62,8 +62,8 @@ struct QL_EXPORT DynamicMatrix {
     static void* getDataFcn(void* matrix);
     /// Writes each dimension.
     static void getDataDimsFcn(const void* matrix, unsigned long* dims);
-    /// Sets all dimensions. On a record without a buffer as dataConstructFcn without initial data; otherwise
-    /// `elementSize` is not used.
+    /// Sets all dimensions. On a record without a buffer or without dimensions as dataConstructFcn without initial data;
+    /// otherwise `elementSize` is not used.
     static void updateDataDimsFcn(unsigned long numDims, const unsigned long* dims, unsigned long elementSize,
                                   void* matrix);
     /// Sets one dimension. Throws std::out_of_range.

@@ -17,6 +17,11 @@ template <class... Args> [[noreturn]] void raise(const char* category, const cha
 /// Throws the out-of-memory diagnostic.
 [[noreturn]] void raiseOutOfMemory();
 
+/// Throws a diagnostic that a function returned; nothing for null.
+inline void passOn(qlsvDiagnosticImpl* diagnostic) {
+    if (diagnostic) qlsvThrowIExceptionFromDiagnostic(diagnostic, nullptr);
+}
+
 /// A diagnostic that holds the message, for functions that return it instead of throwing.
 qlsvDiagnosticImpl* diagnosticOf(const resource_core::BaseMsgID& message);
 

@@ -7,6 +7,8 @@
 
 #include "qlplatform/arrays/HostArray.h"
 #include "qlplatform/memory/Memory.h"
+#include "qltypes/dynamic_matrix/DynamicMatrix.h"
+#include "qltypes/dynamic_matrix/DynamicMatrixDataType.h"
 #include "qltypes/fixed_point/TypeNames.h"
 #include "qltypes/host/Assert_internal.h"
 #include "qltypes/host/Failure_internal.h"
@@ -370,6 +372,10 @@ void DataType::destroyScalarElement(void* p) const {
 void DataType::constructScalarElement(void* p) const {
     if (plainConstruct_) return;
     if (!getConstructFcn()(p, getProperties())) reportFailedFcn("Construct");
+    if (!isDynamicMatrix()) return;
+    auto& matrix = *static_cast<DynamicMatrix*>(p);
+    matrix.setDims(std::vector<long>(containedDataNumDims_));
+    matrix.elementSize = static_cast<unsigned long>(static_cast<const DynamicMatrixDataType*>(this)->getElementSize());
 }
 
 void DataType::serializeScalarElement(const void* src, void* dst, unsigned long a, unsigned long b) const {

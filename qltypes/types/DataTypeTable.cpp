@@ -369,10 +369,19 @@ int DataTypeTable::registerDataType(const char* name, DataTypeSource source, con
     return enter(std::move(record), existing, blockName);
 }
 
-int DataTypeTable::enter(std::unique_ptr<DataType> record, int existing, const char* blockName) {
+int DataTypeTable::enter(std::unique_ptr<DataType> record, int existing, const char* blockName,
+                         const std::function<void()>& complete) {
     DataType* const entered = record.get();
     addDataType(entered);
     record.release();
+    try {
+        if (complete) complete();
+    } catch (...) {
+        if (existing == DATA_TYPE_ID_INVALID) dataTypeIdsByName_->erase(entered->getName());
+        dataTypes_.pop_back();
+        delete entered;
+        throw;
+    }
     checkWithClient(entered, blockName);
     if (existing != DATA_TYPE_ID_INVALID) replaceDataType(recordAt(existing), entered);
     return entered->getId();

@@ -11,6 +11,7 @@
 // ../structures/StructDataTypeUtils.h. One thread at a time uses a table: even reads fill caches.
 #pragma once
 
+#include <functional>
 #include <iosfwd>
 #include <map>
 #include <memory>
@@ -80,15 +81,22 @@ class QL_EXPORT DataTypeTable {
     virtual int registerAliasDataType(const char* name, DataTypeSource source, int aliasedTo, const char* blockName);
     /// Registers an empty structure. Raises as registerDataType.
     virtual int registerStructDataType(const char* name, DataTypeSource source, const char* blockName);
-    /// Registers a string type; 0 is dynamic. A null name is made from the length.
+    /// Registers a string type of at most `maxLength` UTF-16 units; 0 is dynamic. A null name is made from the length,
+    /// and "character" of length 1 is registered with it. Raises as registerDataType, and out of memory.
     virtual int registerStringDataType(unsigned long maxLength, const char* name);
-    /// Registers a date-time type; a null name is made from its scale and storage.
+    /// Registers a date-time type under the name that the type gives itself; `name` is only passed to the client's
+    /// check. Its size is the word length of the storage in bits. Raises as registerDataType, also for a type whose own
+    /// name is no identifier, and `InvalidDataTypeSize` for a word length of 0 or less.
     virtual int registerDateTimeDataType(const QLDateTime::DateTimeType& type, const char* name);
     /// Copies a type of another table into this one. Raises as registerDataType.
     virtual int registerOpaqueDataType(const DataType* source, const char* blockName);
-    /// Registers a matrix of `elementId` with `numDims` dimensions that may change at run time.
+    /// Registers a matrix of `elementId` with `numDims` dimensions that change at run time; a matrix of matrices is the
+    /// matrix itself. Raises as registerDataType, and `InvalidDataTypeId`.
     virtual int registerDynamicMatrixDataType(int elementId, unsigned long numDims);
-    /// Registers an image type.
+    /// Registers an image type, and the type that stores it: a dynamic matrix, or "cv_Mat" when the hook
+    /// "ImageTypeImplementation" is 1. Raises as registerDataType, `InvalidImageTypeNumChannels` and
+    /// `InvalidImageTypeNumChannels2` (the dynamic matrix then stays), and `InvalidDataTypeId` when there is no type to
+    /// store it.
     virtual int registerImageDataType(unsigned long numChannels, SSImageColorFormat colorFormat,
                                       SSImageDataLayout dataLayout, BuiltInDTypeId baseType);
     /// Buses are a subclass's business: -1 here.
@@ -339,8 +347,10 @@ class QL_EXPORT DataTypeTable {
     /// Whether `name` is registered and stands as it is; `existing` is its id in any case.
     bool isRegisteredAlready(const char* name, DataTypeSource source, int& existing) const;
     int nextId() const { return getNumDataTypes() - 1; }
-    /// Last steps of every registration: add, let the client check, replace `existing` unless it is -10.
-    int enter(std::unique_ptr<DataType> record, int existing, const char* blockName);
+    /// Last steps of every registration: add, complete what needs the record in its place, let the client check,
+    /// replace `existing` unless it is -10. What `complete` throws undoes the registration.
+    int enter(std::unique_ptr<DataType> record, int existing, const char* blockName,
+              const std::function<void()>& complete = {});
     void checkWithClient(DataType* record, const char* blockName);
     bool isNumeric(int id, int highestBuiltIn) const;
     void convert(const DataType* chosen, int dstId, int srcId, int count, const void* src, const void* aux,

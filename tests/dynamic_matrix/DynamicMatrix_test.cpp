@@ -331,6 +331,19 @@ TEST(DynamicMatrix, ACopyOfASourceWithoutABufferIsAllocatedAndUnset) {
     EXPECT_TRUE(isManaged(scalar));
 }
 
+TEST(DynamicMatrix, ACopyOfAnUnshapedSourceIsAllocatedAtItsNextUpdate) {
+    const DynamicMatrix unshaped;
+    DynamicMatrix to;
+    update(to, {2, 3}, 8);
+    DynamicMatrix::copyFcn(&to, &unshaped);
+    EXPECT_TRUE(to.dims.empty());
+    EXPECT_NE(to.rawData, nullptr);
+    update(to, {40, 5}, 8);
+    EXPECT_EQ(to.elementSize, 8u);
+    EXPECT_TRUE(isManaged(to));
+    std::memset(to.rawData, 1, 40 * 5 * 8);
+}
+
 TEST(DynamicMatrix, AByteWiseCopyCannotReleaseTheBufferOfItsOwner) {
     alignas(DynamicMatrix) unsigned char ownerMemory[sizeof(DynamicMatrix)];
     alignas(DynamicMatrix) unsigned char copyMemory[sizeof(DynamicMatrix)];
