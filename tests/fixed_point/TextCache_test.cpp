@@ -145,6 +145,13 @@ TEST(TextCache, OrderIsStrictAndTransitive) {
             }
 }
 
+TEST(TextCache, ABiasAloneIsAScaling) {
+    const fxpDataTypeProp withNaN{FXP_DT_FIXPT, 1, 16, 0, 0, 1.0, notANumber, 0};
+    EXPECT_EQ(&FXP::textCacheEntry(withNaN), &FXP::textCacheEntry(withNaN));
+    EXPECT_EQ(&FXP::textCacheEntry({FXP_DT_DOUBLE, 1, 64, 11, 0, 1.0, 8.0, 0}),
+              &FXP::textCacheEntry({FXP_DT_DOUBLE, 1, 64, 11, 0, 1.0, 9.0, 0}));
+}
+
 TEST(TextCache, EntriesAreMadeOnceAndStay) {
     fxpTextCacheEntry& first = FXP::textCacheEntry(plain);
     fxpTextCacheEntry& second = FXP::textCacheEntry(scaled);
