@@ -1,9 +1,6 @@
 // What the two targets of number texts share: how a reading ended, and when two records are the same.
 #pragma once
 
-#include <bit>
-#include <cmath>
-#include <cstdint>
 #include <string_view>
 
 #include <boost/lexical_cast/bad_lexical_cast.hpp>
@@ -26,9 +23,11 @@ template <class Read> reference::Ending endingOf(Read read) {
     }
 }
 
-/// Whether both text forms can hold the record, so that it comes back the same.
-inline bool survivesWriting(const fxpDataTypeProp& prop) {
-    return prop.validateFxpDTProp() && !(prop.Bias == 0.0 && std::signbit(prop.Bias));
+/// Whether `again`, read from what was written of `prop`, is the same record. Records that differ only in the sign of a
+/// zero bias share their texts, so that sign may come from another record.
+inline bool cameBack(const fxpDataTypeProp& prop, fxpDataTypeProp again) {
+    if (prop.Bias == 0.0 && again.Bias == 0.0) again.Bias = prop.Bias;
+    return again == prop;
 }
 
 } // namespace fuzz

@@ -26,9 +26,10 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
             const std::string& written = fxpDataTypeToConstructorString(prop, base, rep);
             const bool hasOverride = prop.DataTypeMode == FXP_DT_BOOLEAN && prop.DataTypeOverrideOff;
             const bool hasNoFraction = rep == FxpDT::PreferFractionLength && prop.FixedExponent == INT_MIN;
-            if (!fuzz::survivesWriting(prop) || hasOverride || hasNoFraction) continue;
+            if (!prop.validateFxpDTProp() || hasOverride || hasNoFraction) continue;
             const fxpDataTypeProp& again = constructorStringToFxpDataType(written).prop;
-            fuzz::claim(rep == FxpDT::PreferNoScaling ? again.WordLength == prop.WordLength : again == prop,
+            fuzz::claim(rep == FxpDT::PreferNoScaling ? again.WordLength == prop.WordLength
+                                                      : fuzz::cameBack(prop, again),
                         "a written record reads back");
         }
     }

@@ -58,7 +58,11 @@ QL_EXPORT void fxpDataTypeToConstructorString_FixptGuts(std::string& out, const 
 
 } // namespace FxpDT
 
-/// Writes the constructor text. Any custom float is written 'half'; a boolean never carries the override pair.
+/// Writes the constructor text. Reading it gives the record back, except that
+/// - any custom float becomes half, and a boolean never carries the override pair;
+/// - PreferNoScaling drops the scaling;
+/// - a factor outside 1.0 to below 2.0 comes back normalised;
+/// - a word length below 0, and a FixedExponent of -2^31 by fraction length, give texts that cannot be read.
 /// Unchecked: the mode of `prop` must be one of the six.
 QL_EXPORT const std::string& fxpDataTypeToConstructorString(const fxpDataTypeProp& prop, FxpDT::baseCtorPrefer base,
                                                             FxpDT::scalingRepPrefer rep);

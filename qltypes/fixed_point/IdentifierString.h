@@ -35,9 +35,11 @@ inline const fxpDataTypeProp& identifierStringToFxpDataType(const char* text) {
     return identifierStringToFxpDataType(std::string_view(text));
 }
 
-/// Writes the identifier text. Reading it gives the record back, except that: an open sign becomes unsigned; any custom
-/// float is written "half"; DataTypeOverrideOff is not written; a factor below 1.0 or at least 2.0 comes back
-/// normalised; a factor of 0.0 or below, a number that is not finite and a word length below 1 give texts that cannot
-/// be read. 64-bit integers get the name that fxpTypesFeatureControl.h chooses. Unchecked: `prop` must not be null and
-/// its mode must be one of the six.
+/// Writes the identifier text. Reading it gives the record back, except that
+/// - an open sign becomes unsigned, any custom float becomes half, DataTypeOverrideOff becomes 0;
+/// - a factor outside 1.0 to below 2.0 comes back normalised while FixedExponent lies in -1022 to 1023;
+/// - such a factor at other exponents, a factor of 0.0 or below, a slope or bias that is not finite and a word length
+///   below 1 give texts that cannot be read.
+/// 64-bit integers get the name that fxpTypesFeatureControl.h chooses.
+/// Unchecked: `prop` must not be null and its mode must be one of the six.
 QL_EXPORT const std::string& fxpDataTypeToIdentifierString(const fxpDataTypeProp* prop);
