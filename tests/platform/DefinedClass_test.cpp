@@ -139,6 +139,13 @@ TEST(DefinedClass, RealPartsCountWhereValuesAreComplex) {
     EXPECT_EQ(values[1], Pair(0, 0));
 }
 
+TEST(DefinedClass, TheFirstMemberSaysHowObjectsAreStored) {
+    DefinedClass mode("Mode", ClassKind::enumeration);
+    mode.addMember("Off", txArrayPtr(txCreateRow<std::int8_t>({0}))).addMember("On", 1);
+    const txArrayPtr objects = mode.objectsFrom(txArrayPtr(txCreateDoubleScalar(1)).get());
+    EXPECT_EQ(txGetClassID(omGetUnderlyingArray(objects.get())), txClassInt8);
+}
+
 TEST(DefinedClass, ConstructorsTakeOneArray) {
     defineClass(makeGear());
     txArray_tag* inputs[2] = {};

@@ -105,6 +105,13 @@ TEST(EnumCheck, NothingIsAskedPastTheFirstFault) {
     EXPECT_EQ(cls->questions, "name isEnumeration superclasses");
 }
 
+TEST(EnumCheck, WhatIsNoEnumerationIsNotCheckedFurther) {
+    auto cls = validClass();
+    cls->isEnum = false;
+    EXPECT_FALSE(qlIsValidEnumDataType(cls));
+    EXPECT_EQ(cls->questions, "isEnumeration");
+}
+
 TEST(EnumCheck, SuperclassesByTheFeature) {
     struct Row {
         const char* superclass;
