@@ -190,9 +190,9 @@ const char* txGetClassName(const txArray_tag* array) {
     return classId == txClassObject ? array->elements->texts() : hostarray::nameOfClass(classId);
 }
 
-std::size_t txGetNumRows(const txArray_tag* array) { return array->rows; }
-std::size_t txGetNumColumns(const txArray_tag* array) { return array->columns; }
-std::size_t txGetNumberOfElements(const txArray_tag* array) { return array->rows * array->columns; }
+std::size_t txGetNumRows(const txArray_tag* array) { return array ? array->rows : 0; }
+std::size_t txGetNumColumns(const txArray_tag* array) { return array ? array->columns : 0; }
+std::size_t txGetNumberOfElements(const txArray_tag* array) { return array ? array->rows * array->columns : 0; }
 
 bool txIsComplex(const txArray_tag* array) {
     return array && (array->flags & hostarray::complex) == hostarray::complex;

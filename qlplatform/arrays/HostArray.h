@@ -108,6 +108,7 @@ QL_EXPORT txClassID txGetClassID(const txArray_tag* array);
 /// The name of the class: "double", "cell", for an object that of its own class. Owned by the array; empty for null.
 QL_EXPORT const char* txGetClassName(const txArray_tag* array);
 
+// Sizes are 0 for null.
 QL_EXPORT std::size_t txGetNumRows(const txArray_tag* array);
 QL_EXPORT std::size_t txGetNumColumns(const txArray_tag* array);
 QL_EXPORT std::size_t txGetNumberOfElements(const txArray_tag* array);

@@ -62,6 +62,9 @@ TEST(HostArray, NullIsNoArray) {
     EXPECT_STREQ(txGetClassName(nullptr), "");
     EXPECT_FALSE(txIsComplex(nullptr));
     EXPECT_EQ(txGetElementSize(nullptr), 0u);
+    EXPECT_EQ(txGetNumRows(nullptr), 0u);
+    EXPECT_EQ(txGetNumColumns(nullptr), 0u);
+    EXPECT_EQ(txGetNumberOfElements(nullptr), 0u);
     EXPECT_EQ(txGetData(nullptr), nullptr);
     EXPECT_EQ(txArrayToUTF8StdString(nullptr), "");
     EXPECT_EQ(txGetCell(nullptr, 0), nullptr);
