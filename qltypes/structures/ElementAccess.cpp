@@ -4,6 +4,7 @@
 #include <climits>
 
 #include "qltypes/structures/Arithmetic_internal.h"
+#include "qltypes/structures/ElementIndex_internal.h"
 #include "qltypes/structures/StructDataType.h"
 #include "qltypes/structures/StructDataTypeUtils.h"
 #include "qltypes/types/DataTypeTable.h"
@@ -95,14 +96,7 @@ void ImmediateElementAccess::containsAoBOrVarDimsOrFrames(bool* arraysOfBuses, b
 }
 
 long ImmediateElementAccess::getRawElementIdx(long idx) const {
-    long raw = 0;
-    for (long i = 0; i < idx; ++i) {
-        const int type = getDataTypeId(i);
-        const bool isNested = type != DATA_TYPE_ID_AUTO && DtIsStructType(table_, type);
-        raw = wrappingAdd(raw, isNested ? wrappingMultiply(getWidth(i), DtGetDataTypeNumRawElements(table_, type))
-                                        : getComplexWidth(i));
-    }
-    return raw;
+    return ElementIndex::of(table_, dataTypeId_).rawSpansBefore(idx);
 }
 
 } // namespace QLTypeSys

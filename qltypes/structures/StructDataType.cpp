@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "qltypes/structures/Arithmetic_internal.h"
+#include "qltypes/structures/ElementIndex_internal.h"
 #include "qltypes/types/DataTypeTable.h"
 
 using QLTypeSys::DataType;
@@ -22,6 +23,7 @@ StructDataType::StructDataType(int id, const std::string& name, DataTypeSource s
 }
 
 StructDataType::~StructDataType() {
+    if (indexes_) indexes_->release(cachedElements_, true);
     for (StructElement* element : elements_)
         delete element;
 }
@@ -34,8 +36,8 @@ long StructDataType::getNumFlatElements() const                                 
 long StructDataType::getNumRawElements() const                                  { return numRawElements_; }
 long StructDataType::getNumDFSElements() const                                  { return numDFSElements_; }
 void StructDataType::setNumFlatElements(long count)                             { numFlatElements_ = count; }
-void StructDataType::setNumRawElements(long count)                              { numRawElements_ = count; }
-void StructDataType::setNumDFSElements(long count)                              { numDFSElements_ = count; }
+void StructDataType::setNumRawElements(long count)                             { numRawElements_ = count; noteEdit(); }
+void StructDataType::setNumDFSElements(long count)                             { numDFSElements_ = count; noteEdit(); }
 const std::vector<StructElement*>& StructDataType::getElements() const          { return elements_; }
 const qlChecksumValue& StructDataType::getDtChecksumValue() const               { return dtChecksumValue_; }
 void StructDataType::setDtChecksumValue(const qlChecksumValue& value)           { dtChecksumValue_ = value; }
@@ -49,6 +51,12 @@ void StructDataType::setNumElements(long count) {
     elements_.resize(static_cast<std::size_t>(count));
     for (StructElement*& slot : elements_)
         slot = new StructElement; // kept: over whatever was there
+    noteEdit();
+}
+
+// Only what views have read can be out of date.
+void StructDataType::noteEdit() const {
+    if (indexes_) QLTypeSys::structures::noteEdit();
 }
 
 std::vector<int> StructDataType::dependsOn() const {
@@ -102,33 +110,44 @@ FrequentlyAccessedProperties StructDataType::createCacheForFrequentlyAccessedPro
 // --- Flat and depth-first indices ------------------------------------------------------------------------------------
 
 long StructDataType::getDFSIdxFromFlatIdx(long flatIdx) const {
-    if (flatIdx < static_cast<long>(dfsIdxFromFlatIdx_.size()))
-        return dfsIdxFromFlatIdx_[static_cast<std::size_t>(flatIdx)];
+    const auto numKnown = static_cast<long>(dfsIdxFromFlatIdx_.size());
+    if (flatIdx < numKnown) return dfsIdxFromFlatIdx_[static_cast<std::size_t>(flatIdx)];
+    const long within = numFlatElements_ > 0 ? flatIdx % numFlatElements_ : numKnown;
+    if (within >= numKnown) return -1; // counted, but no leaf: of a nested structure that is said to be complex
     const double quotient = std::floor(static_cast<double>(flatIdx) / static_cast<double>(numFlatElements_));
-    const long instance = std::isinf(quotient) ? std::numeric_limits<long>::max() : static_cast<long>(quotient);
-    const long within = flatIdx % numFlatElements_;
-    return wrappingAdd(wrappingMultiply(instance, numDFSElements_),
+    return wrappingAdd(wrappingMultiply(static_cast<long>(quotient), numDFSElements_),
                        dfsIdxFromFlatIdx_[static_cast<std::size_t>(within)]);
 }
 
 long StructDataType::getFlatIdxFromDFSIdx(const long& dfsIdx) const {
+    if (numDFSElements_ <= 0) return -1;
     const bool isFurther = dfsIdx >= numDFSElements_;
     const long instance = isFurther ? dfsIdx / numDFSElements_ : 0;
     const long within = isFurther ? dfsIdx % numDFSElements_ : dfsIdx;
-    const auto found = std::find(dfsIdxFromFlatIdx_.begin(), dfsIdxFromFlatIdx_.end(), within);
-    const long position = found - dfsIdxFromFlatIdx_.begin();
-    return position == numFlatElements_ ? -1 : instance * numFlatElements_ + position;
+    const auto begin = dfsIdxFromFlatIdx_.begin();
+    const auto end = dfsIdxFromFlatIdx_.end();
+    auto found = dfsIdxFromFlatIdxIsSorted_ ? std::lower_bound(begin, end, within) : std::find(begin, end, within);
+    if (found != end && *found != within) found = end;
+    const long position = found - begin;
+    return position == numFlatElements_ ? -1 : wrappingAdd(wrappingMultiply(instance, numFlatElements_), position);
 }
 
 void StructDataType::setDFSIdxFromFlatIdx(const std::vector<long>& dfsIdxFromFlatIdx) {
     dfsIdxFromFlatIdx_ = dfsIdxFromFlatIdx;
+    dfsIdxFromFlatIdxIsSorted_ = std::is_sorted(dfsIdxFromFlatIdx_.begin(), dfsIdxFromFlatIdx_.end());
 }
 
 // --- What views answered ---------------------------------------------------------------------------------------------
 
-void StructDataType::clearDFSCache() { cachedElements_.clear(); }
+void StructDataType::clearDFSCache() {
+    if (indexes_) indexes_->release(cachedElements_, false);
+    indexes_.reset();
+    cachedElements_.clear();
+}
 
-CachedElement* StructDataType::getCachedElement(long dfsIdx) { return &cachedElements_[dfsIdx]; }
+CachedElement* StructDataType::getCachedElement(long dfsIdx) {
+    return indexes_ && indexes_->own ? &indexes_->own->written(dfsIdx, true) : &cachedElements_[dfsIdx];
+}
 
 BusDataType::~BusDataType() = default;
 bool BusDataType::isBusType() const { return true; }

@@ -11,6 +11,7 @@
 //   qlsvDiagnosticImpl* failed = DtComputeDerivedStructAttributes(&table, id);
 #pragma once
 
+#include <memory>
 #include <vector>
 
 #include <boost/unordered_map.hpp>
@@ -23,6 +24,10 @@
 namespace QLTypeSys {
 class DataTypeTable;
 }
+namespace QLTypeSys::structures {
+class ElementIndex;
+struct ElementIndexes;
+} // namespace QLTypeSys::structures
 
 /// What a depth-first view answered for one index.
 struct QL_EXPORT CachedElement {
@@ -71,10 +76,10 @@ class QL_EXPORT StructDataType : public QLTypeSys::DataType {
     virtual void setNumDFSElements(long count);
     /// The immediate elements. Owned by the record.
     virtual const std::vector<StructElement*>& getElements() const;
-    /// The depth-first index of a leaf. An index past the end lies in a further instance of the structure. Unchecked:
-    /// the index vector must be filled, and the counts must not be 0.
+    /// The depth-first index of a leaf, from the vector that setDFSIdxFromFlatIdx set. An index past the end lies in a
+    /// further instance of the structure. -1 where the vector has no entry. Unchecked: `flatIdx` must not be negative.
     virtual long getDFSIdxFromFlatIdx(long flatIdx) const;
-    /// The flat index of a node; -1 for a node that is no leaf. Unchecked as getDFSIdxFromFlatIdx.
+    /// The flat index of a node; -1 for a node that is no leaf.
     virtual long getFlatIdxFromDFSIdx(const long& dfsIdx) const;
     /// Replaces the vector that the two operations above read.
     virtual void setDFSIdxFromFlatIdx(const std::vector<long>& dfsIdxFromFlatIdx);
@@ -120,6 +125,7 @@ class QL_EXPORT StructDataType : public QLTypeSys::DataType {
 
   protected:
     friend struct StructLayoutPass;
+    friend class QLTypeSys::structures::ElementIndex;
 
     long numFlatElements_ = 0;
     long numRawElements_ = 0;
@@ -131,6 +137,12 @@ class QL_EXPORT StructDataType : public QLTypeSys::DataType {
     bool propertiesCached_ = false;
     FrequentlyAccessedProperties derived_{};
     boost::unordered_map<long, CachedElement> cachedElements_;
+
+  private:
+    void noteEdit() const;
+
+    bool dfsIdxFromFlatIdxIsSorted_ = true;
+    std::unique_ptr<QLTypeSys::structures::ElementIndexes> indexes_; // made by views, dropped by clearDFSCache
 };
 
 /// A structure that is a bus. Clients derive from it and maintain its fields; nothing here writes them.

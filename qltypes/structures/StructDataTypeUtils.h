@@ -60,6 +60,29 @@ QL_EXPORT long DtGetDataTypeElementVarDimsOffset(const QLTypeSys::DataTypeTable*
 QL_EXPORT long DtGetDataTypeElementComplexWidth(const QLTypeSys::DataTypeTable* table, int id, long index);
 QL_EXPORT bool DtGetDataTypeElementIsScalar(const QLTypeSys::DataTypeTable* table, int id, long index);
 
+// --- Leaves, by flat index; an index past the end lies in a further instance of the structure. The same unchecked.
+
+QL_EXPORT const char* DtGetDataTypeFlatElementName(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+QL_EXPORT std::string DtGetDataTypeFlatElementFullPath(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+QL_EXPORT int DtGetDataTypeFlatElementDataTypeId(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+QL_EXPORT int DtGetDataTypeFlatElementDimensionsMode(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+QL_EXPORT long DtGetDataTypeFlatElementNumDimensions(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+QL_EXPORT long DtGetDataTypeFlatElementDimension(const QLTypeSys::DataTypeTable* table, int id, long flatIdx, long dimIndex);
+QL_EXPORT int DtGetDataTypeFlatElementSignalType(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+QL_EXPORT long DtGetDataTypeFlatElementComplexWidth(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+QL_EXPORT long DtGetDataTypeFlatElementOffset(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+QL_EXPORT double DtGetDataTypeFlatElementMax(const QLTypeSys::DataTypeTable* table, int id, long flatIdx);
+
+// --- Nodes, by depth-first index; an index past the end lies in a further instance of the structure. The same unchecked.
+
+QL_EXPORT int DtGetDataTypeDFSElementDataTypeId(const QLTypeSys::DataTypeTable* table, int id, long dfsIdx);
+QL_EXPORT long DtGetDataTypeDFSElementWidth(const QLTypeSys::DataTypeTable* table, int id, long dfsIdx);
+QL_EXPORT int DtGetDataTypeDFSElementSignalType(const QLTypeSys::DataTypeTable* table, int id, long dfsIdx);
+QL_EXPORT int DtGetDataTypeDFSElementDimensionsMode(const QLTypeSys::DataTypeTable* table, int id, long dfsIdx);
+QL_EXPORT long DtGetDataTypeDFSElementNumDimensions(const QLTypeSys::DataTypeTable* table, int id, long dfsIdx);
+QL_EXPORT long DtGetDataTypeDFSElementDimension(const QLTypeSys::DataTypeTable* table, int id, long dfsIdx, long dimIndex);
+QL_EXPORT std::string DtGetDataTypeDFSElementQRTPathFromIdx(const QLTypeSys::DataTypeTable* table, int id, long dfsIdx);
+
 // --- Element setters. Write without further check and return null; `blockName` is not used. Unchecked as above.
 
 QL_EXPORT qlsvDiagnosticImpl* DtSetDataTypeElementUnitId(QLTypeSys::DataTypeTable* table, const char* blockName, int id, long index, int unitId);
@@ -88,7 +111,32 @@ QL_EXPORT qlsvDiagnosticImpl* DtSetDataTypeNumElements(QLTypeSys::DataTypeTable*
 QL_EXPORT qlsvDiagnosticImpl* DtCheckDataTypeElementIndex(const QLTypeSys::DataTypeTable* table, const char* blockName,
                                                           int id, long index);
 
+/// How far node `dfsIdx` lies behind node `ancestorIdx` inside the latter's subtree, 0 for the same node; -1 when it is
+/// not in the subtree. The subtree of an array as a whole has all of its instances. Unchecked as above.
+QL_EXPORT long DtIsDFSElementDescendant(const QLTypeSys::DataTypeTable* table, int id, long ancestorIdx, long dfsIdx);
+
+/// Byte offsets of the leaves of an array of structures with the given dimensions, none for a single structure. Buses
+/// are followed down; a nested structure that is no bus counts as one leaf. Throws std::length_error("vector::reserve")
+/// when there would be 2^61 offsets or more. Unchecked: `id` must be a structure or an alias of one.
+QL_EXPORT std::vector<unsigned long> DtGetDataTypeFullHierarchyOffset(const QLTypeSys::DataTypeTable* table, int id,
+                                                                      const std::vector<unsigned int>& dims);
+
 // --- Buses -----------------------------------------------------------------------------------------------------------
 
-/// Whether the type at the end of the alias chain is a structure that says to be a bus. Raises `InvalidDataTypeId`.
+/// Whether the type at the end of the alias chain is a structure that says to be a bus; false for -1. Raises
+/// `InvalidDataTypeId`.
 QL_EXPORT bool DtGetDataTypeIsBus(const QLTypeSys::DataTypeTable* table, int id);
+/// Whether the type is a bus with variable dimensions somewhere in it. Raises `InvalidDataTypeId`.
+QL_EXPORT bool DtGetDataTypeIsBusWithVarDimsElement(const QLTypeSys::DataTypeTable* table, int id);
+
+// What the bus at the end of the alias chain says of itself. Raise `InvalidDataTypeId`. Unchecked: it must be a bus.
+
+/// Whether any leaf has a minimum or a maximum: the shared minimum is not -inf, or the shared maximum not +inf.
+QL_EXPORT bool DtDoesBusHaveElementWithMinMax(const QLTypeSys::DataTypeTable* table, int id);
+/// Whether the leaves agree in their minimum: the shared one is not +inf.
+QL_EXPORT bool DtDoesBusHaveSameMinForAllLeaf(const QLTypeSys::DataTypeTable* table, int id);
+QL_EXPORT double DtGetBusSameMinValForAllLeaf(const QLTypeSys::DataTypeTable* table, int id);
+/// Whether the leaves agree in their maximum: the shared one is not -inf.
+QL_EXPORT bool DtDoesBusHaveSameMaxForAllLeaf(const QLTypeSys::DataTypeTable* table, int id);
+QL_EXPORT double DtGetBusSameMaxValForAllLeaf(const QLTypeSys::DataTypeTable* table, int id);
+QL_EXPORT bool DtDoesBusHaveLeafWithSymbolicDimensions(const QLTypeSys::DataTypeTable* table, int id);

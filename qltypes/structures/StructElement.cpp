@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "qltypes/structures/Arithmetic_internal.h"
+#include "qltypes/structures/ElementIndex_internal.h"
 
 using QLTypeSys::structures::narrowed;
 using QLTypeSys::structures::wrappingMultiply;
@@ -22,6 +23,18 @@ StructElement::~StructElement() {
 
 void StructElement::setName(const char* elementName) { name = elementName ? elementName : ""; }
 
+// Each write of what the numbering of nodes depends on tells the views.
+
+void StructElement::setDataTypeId(int id) {
+    dataTypeId = id;
+    if (isIndexed_) QLTypeSys::structures::noteEdit();
+}
+
+void StructElement::setSignalType(int type) {
+    signalType = type;
+    if (isIndexed_) QLTypeSys::structures::noteEdit();
+}
+
 void StructElement::setNumDimensions(long count) {
     const auto newCount = count < 1 ? 0ul : static_cast<unsigned long>(count);
     if (newCount == numDims) return;
@@ -36,11 +49,13 @@ void StructElement::setNumDimensions(long count) {
     intDims = nullptr;
     numDims = newCount;
     dims = newCount == 1 ? &inlineDim : newDims;
+    if (isIndexed_) QLTypeSys::structures::noteEdit();
 }
 
 void StructElement::setDimension(long index, long value) {
     dims[index] = value;
     if (intDims) intDims[index] = narrowed(value);
+    if (isIndexed_) QLTypeSys::structures::noteEdit();
 }
 
 const int* StructElement::getDimensionsAsInt(const ObsoleteIntDimsKey&) {

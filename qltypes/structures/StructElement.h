@@ -11,15 +11,27 @@
 
 #include "qlplatform/Export.h"
 
+namespace QLTypeSys::structures {
+class ElementIndex;
+}
+
 /// Names a call of the obsolete interface that takes dimensions as 32-bit integers.
 struct ObsoleteIntDimsKey {};
 
 /// One element of a structure. A plain record, not copied: `dims` points into the element when there is one dimension.
+/// Who writes type, dimensions or signal type without the setters after views were asked calls
+/// StructDataType::clearDFSCache on the structure and on those that contain it.
 struct QL_EXPORT StructElement {
     std::string name;
-    int dataTypeId = -10;      ///< -10 while not set
-    int unitId = -1;           ///< id of a unit, the client's
-    int symbDimsId = 0;        ///< symbolic dimensions; 0 is numeric
+    int dataTypeId = -10; ///< -10 while not set
+    int unitId = -1;      ///< id of a unit, the client's
+    int symbDimsId = 0;   ///< symbolic dimensions; 0 is numeric
+
+  private:
+    friend class QLTypeSys::structures::ElementIndex;
+    bool isIndexed_ = false; // views have read type, dimensions or signal type
+
+  public:
     unsigned long numDims = 0; ///< number of dimensions; an element without any is a scalar
     long* dims = nullptr;      ///< null, `&inlineDim` for one dimension, or an own array of `numDims`
     int* intDims = nullptr;    ///< narrowed copy of `dims`, made on first use; owned
@@ -39,12 +51,12 @@ struct QL_EXPORT StructElement {
 
     /// Null stores the empty name.
     void setName(const char* elementName);
-    void setDataTypeId(int id) { dataTypeId = id; }
+    void setDataTypeId(int id);
     void setUnitId(int id) { unitId = id; }
     void setSymbDimsId(int id) { symbDimsId = id; }
     void setOffset(long bytes) { offset = bytes; }
     void setVarDimsOffset(long bytes) { varDimsOffset = bytes; }
-    void setSignalType(int type) { signalType = type; }
+    void setSignalType(int type);
     void setSamplingMode(int mode) { samplingMode = mode; }
     void setDimensionsMode(int mode) { dimensionsMode = mode; }
     void setMin(double value) { min = value; }

@@ -1,4 +1,5 @@
 // What the table knows of structures.
+#include "qltypes/structures/ElementAccess.h"
 #include "qltypes/structures/StructDataType.h"
 #include "qltypes/types/DataTypeTable.h"
 
@@ -39,5 +40,14 @@ void DataTypeTable::doesBusDTContainArraysOfBusesOrVarDimsOrFrames(int id, bool*
     *varDims = doesBusDTHaveVarDims(id);
     *frames = doesBusDTHaveFrameBasedElements(id);
 }
+
+// clang-format off
+long DataTypeTable::getDataTypeRawElementIdxFromImmediateElementIdx(int id, long index) const   { return ImmediateElementAccess(this, id).getRawElementIdx(index); }
+double DataTypeTable::getDataTypeFlatElementMin(int id, long index) const                       { return FlatElementAccess(this, id).getMin(index); }
+double DataTypeTable::getDataTypeDFSElementMax(int id, long index) const                        { return DFSElementAccess(this, id).getMax(index); }
+double DataTypeTable::getDataTypeDFSElementMin(int id, long index) const                        { return DFSElementAccess(this, id).getMin(index); }
+double DataTypeTable::getDataTypeElementMax(int id, long index) const                           { return ImmediateElementAccess(this, id).getMax(index); }
+double DataTypeTable::getDataTypeElementMin(int id, long index) const                           { return ImmediateElementAccess(this, id).getMin(index); }
+// clang-format on
 
 } // namespace QLTypeSys

@@ -1,0 +1,483 @@
+#include "qltypes/structures/ElementIndex_internal.h"
+
+#include <algorithm>
+#include <atomic>
+#include <cmath>
+
+#include "qltypes/types/DataTypeTable.h"
+
+namespace QLTypeSys::structures {
+
+namespace {
+
+// Process-wide, so that an element need not know its structure. A lone counter: tables of several threads only make
+// each other look again.
+std::atomic<unsigned long> numEdits{1};
+
+unsigned long edits() { return numEdits.load(std::memory_order_relaxed); }
+
+// Up to here the quotient of two whole doubles reaches the next whole number only where the division does.
+constexpr long exactInDouble = 1L << 53;
+
+} // namespace
+
+void noteEdit() { numEdits.fetch_add(1, std::memory_order_relaxed); }
+
+void ElementIndexes::release(boost::unordered_map<long, CachedElement>& answers, bool recordGoes) {
+    bool anyIsHeld = false;
+    const auto letGo = [&](ElementIndex& index) {
+        index.record_ = nullptr;
+        if (recordGoes) index.numbering_ = {};
+        anyIsHeld = true;
+    };
+    if (own && own.use_count() > 1) {
+        own->ownWritten_.swap(answers);
+        own->written_ = &own->ownWritten_;
+        letGo(*own);
+    }
+    for (const auto& [id, index] : underAliases)
+        if (index.use_count() > 1) letGo(*index);
+    if (anyIsHeld) noteEdit();
+}
+
+bool ElementIndex::Nested::operator==(const Nested& other) const {
+    return index == other.index && typeId == other.typeId && size == other.size && width == other.width &&
+           numDFS == other.numDFS && numRaw == other.numRaw;
+}
+
+// --- Reading ---------------------------------------------------------------------------------------------------------
+
+ElementIndex::ElementIndex(const DataTypeTable* table, int id, StructDataType& record)
+    : table_(table), viewId_(id), record_(&record),
+      written_(id == record.getId() ? &record.cachedElements_ : &ownWritten_) {}
+
+ElementIndex& ElementIndex::of(const DataTypeTable* table, int id) {
+    return shared(table, id, *static_cast<StructDataType*>(table->getDataTypeAliasedThruTo(id)))->current();
+}
+
+const std::shared_ptr<ElementIndex>& ElementIndex::shared(const DataTypeTable* table, int id, StructDataType& record) {
+    if (!record.indexes_) record.indexes_ = std::make_unique<ElementIndexes>();
+    ElementIndexes& indexes = *record.indexes_;
+    if (id == record.getId()) {
+        if (!indexes.own) indexes.own = std::make_shared<ElementIndex>(table, id, record);
+        return indexes.own;
+    }
+    for (const auto& [aliasId, index] : indexes.underAliases)
+        if (aliasId == id) return index;
+    return indexes.underAliases.emplace_back(id, std::make_shared<ElementIndex>(table, id, record)).second;
+}
+
+ElementIndex& ElementIndex::current() {
+    const unsigned long now = edits();
+    if (readAt_ == now || !record_) return *this;
+    Numbering numbering = read();
+    if (numbering != numbering_) {
+        writeDown(askedElements_);
+        writeDown(offsets_);
+        writeDown(varDimsOffsets_);
+        for (const Nested& nested : numbering_.nested) // written answers may point to heads that these made
+            if (std::find(kept_.begin(), kept_.end(), nested.index) == kept_.end()) kept_.push_back(nested.index);
+        numbering_ = std::move(numbering);
+        askedElements_.reset(numbering_.numDFS); // now that it has another number of nodes
+        root_ = nullptr;
+        renew(offsets_);
+        renew(varDimsOffsets_);
+    }
+    readAt_ = numbering_.isComplete ? now : 0;
+    return *this;
+}
+
+ElementIndex::Numbering ElementIndex::read() const {
+    const std::vector<StructElement*>& elements = record_->getElements();
+    Numbering made;
+    made.size = table_->getDataTypeAt(static_cast<unsigned long>(viewId_ + 1))->getSize();
+    made.numDFS = record_->getNumDFSElements();
+    made.elements.reserve(elements.size());
+    made.nodes.reserve(elements.size());
+    made.raw.reserve(elements.size());
+    made.nestedAt.reserve(elements.size());
+    for (StructElement* element : elements) {
+        const int typeId = element->dataTypeId;
+        if (!table_->isDataTypeIdValid(typeId)) {
+            made.isComplete = false;
+            break;
+        }
+        element->isIndexed_ = true;
+        made.elements.push_back(element);
+        const long width = element->getWidth();
+        DataType* const type = table_->getDataTypeAliasedThruTo(typeId);
+        if (typeId == DATA_TYPE_ID_AUTO || !type->getIsType(dtqStruct)) {
+            made.nodes.append(1);
+            made.raw.append(element->signalType == 1 ? wrappingMultiply(width, 2) : width);
+            made.nestedAt.push_back(leaf);
+            continue;
+        }
+        auto& structure = static_cast<StructDataType&>(*type);
+        const int size = table_->getDataTypeAt(static_cast<unsigned long>(typeId + 1))->getSize();
+        const long numDFS = structure.getNumDFSElements();
+        const long numRaw = structure.getNumRawElements();
+        made.nodes.append(width > 1 ? wrappingAdd(wrappingMultiply(width, numDFS), 1) : numDFS);
+        made.raw.append(wrappingMultiply(width, numRaw));
+        made.nestedAt.push_back(static_cast<std::uint32_t>(made.nested.size()));
+        made.nested.push_back({shared(table_, typeId, structure), typeId, size, width, numDFS, numRaw});
+    }
+    made.nodes.finish();
+    made.raw.finish();
+    return made;
+}
+
+void ElementIndex::raiseInvalidType() const {
+    table_->checkDataTypeId(record_->getElements()[numbering_.elements.size()]->dataTypeId);
+    std::abort(); // not reached: the type is not valid
+}
+
+// --- Places ----------------------------------------------------------------------------------------------------------
+
+const ElementIndex::Nested* ElementIndex::nestedIn(long element) const {
+    const std::uint32_t position = numbering_.nestedAt[static_cast<std::size_t>(element)];
+    return position == leaf ? nullptr : &numbering_.nested[position];
+}
+
+ElementIndex::Place ElementIndex::place(long idx) const {
+    Place at;
+    const long numNodes = numbering_.numDFS;
+    if (idx <= 0 || numNodes <= 0) return at;
+    if (idx >= numNodes || numNodes >= exactInDouble) {
+        const double quotient = std::floor(static_cast<double>(idx) / static_cast<double>(numNodes));
+        if (quotient > 0) {
+            at.instance = static_cast<long>(quotient);
+            at.base = wrappingMultiply(at.instance, numNodes);
+            return at;
+        }
+    }
+    const long element = numbering_.nodes.find(idx);
+    if (element == numImmediate()) { // the structure says to have more nodes than its elements have
+        if (!numbering_.isComplete) raiseInvalidType();
+        return at;
+    }
+    const long before = numbering_.nodes[element];
+    at.element = element;
+    at.nested = nestedIn(element);
+    if (!at.nested || at.nested->width <= 1) {
+        at.base = before + 1;
+    } else if (idx == before + 1) {
+        at.instance = -1;
+    } else {
+        at.instance = (idx - before - 2) / at.nested->numDFS;
+        at.base = before + 2 + at.nested->numDFS * at.instance;
+    }
+    return at;
+}
+
+// --- Elements of nodes -----------------------------------------------------------------------------------------------
+
+CachedElement* ElementIndex::findWritten(long idx) {
+    if (written_->empty()) return nullptr;
+    const auto found = written_->find(idx);
+    return found == written_->end() ? nullptr : &found->second;
+}
+
+StructElement* ElementIndex::element(long idx) {
+    CachedElement* answer = findWritten(idx);
+    if (answer && answer->element) return answer->element;
+    const Place at = place(idx);
+    StructElement* found;
+    if (at.isRoot())
+        found = answer ? makeRoot().release() : root_ ? root_ : root_ = keep(makeRoot());
+    else if (at.isPastTheEnd())
+        found = element(idx - at.base);
+    else if (at.isArrayNode() || at.isLeaf())
+        found = numbering_.elements[static_cast<std::size_t>(at.element)];
+    else if (at.isHead(idx))
+        found = headOf(at, idx, answer);
+    else
+        found = nestedAt(at).element(idx - at.base);
+    if (answer) {
+        answer->element = found;
+        answer->ownsElement = at.isRoot() || at.isHead(idx);
+    } else {
+        askedElements_.add(idx);
+    }
+    return found;
+}
+
+StructElement* ElementIndex::headOf(const Place& at, long idx, CachedElement*& answer) {
+    const std::string& nameNow = immediate(at.element).name;
+    if (!answer) {
+        Nested& nested = numbering_.nested[static_cast<std::size_t>(at.nested - numbering_.nested.data())];
+        if (!nested.name) nested.name = nameNow;
+        if (askedElements_.contains(idx) || *nested.name == nameNow) {
+            if (!nested.head) nested.head = keep(makeHead(at, *nested.name));
+            return nested.head;
+        }
+        answer = &written(idx, false); // renamed since another instance was asked
+    }
+    return makeHead(at, nameNow).release();
+}
+
+StructElement* ElementIndex::keep(std::unique_ptr<StructElement> made) {
+    made_.push_back(std::move(made));
+    return made_.back().get();
+}
+
+std::unique_ptr<StructElement> ElementIndex::makeRoot() const {
+    auto root = std::make_unique<StructElement>();
+    root->dataTypeId = viewId_;
+    root->setNumDimensions(1);
+    root->setDimension(0, 1);
+    root->unitId = 0;
+    root->signalType = root->samplingMode = root->dimensionsMode = 0;
+    return root;
+}
+
+std::unique_ptr<StructElement> ElementIndex::makeHead(const Place& at, const std::string& name) {
+    const StructElement& root = *nestedAt(at).element(0);
+    auto head = std::make_unique<StructElement>();
+    head->name = name;
+    head->signalType = head->samplingMode = head->dimensionsMode = 0; // kept: not those of the element
+    head->dataTypeId = root.dataTypeId;
+    head->setNumDimensions(static_cast<long>(root.numDims));
+    for (long i = 0; i < static_cast<long>(root.numDims); ++i)
+        head->setDimension(i, root.dims[i]);
+    head->symbDimsId = root.symbDimsId;
+    head->unitId = root.unitId;
+    head->min = root.min;
+    head->max = root.max;
+    return head;
+}
+
+// --- Offsets of nodes ------------------------------------------------------------------------------------------------
+
+long ElementIndex::offset(long idx) { return sum(idx, &ElementIndex::offsets_); }
+
+long ElementIndex::varDimsOffset(long idx) { return sum(idx, &ElementIndex::varDimsOffsets_); }
+
+long ElementIndex::sum(long idx, Summands ElementIndex::*which) {
+    Summands& what = this->*which;
+    CachedElement* const answer = findWritten(idx);
+    if (answer && answer->*what.answer != -1) return answer->*what.answer;
+    const Place at = place(idx);
+    long total = 0;
+    bool moved = false;
+    if (what.countsInstances && at.instance > 0)
+        total = wrappingMultiply(at.instance, at.nested ? at.nested->size : numbering_.size);
+    if (at.element >= 0) {
+        long own = what.copies[static_cast<std::size_t>(at.element)];
+        if (answer || !what.wasAsked(idx)) { // elements that were asked may be gone
+            const long now = immediate(at.element).*what.field;
+            moved = now != own;
+            own = now;
+        }
+        total = wrappingAdd(total, own);
+    }
+    if (moved && !answer && (what.wasNeverAsked() || what.numMoved > what.copies.size())) {
+        renew(what);
+        moved = false;
+    }
+    long below = 0;
+    if (!answer && what.askedOverUnset.contains(idx))
+        below = -1;
+    else if (at.isPastTheEnd())
+        below = sum(idx - at.base, which);
+    else if (at.nested && at.base >= 0)
+        below = nestedAt(at).sum(idx - at.base, which);
+    total = wrappingAdd(total, below);
+    if (answer) {
+        answer->*what.answer = total;
+    } else if (moved) {
+        written(idx, false).*what.answer = total;
+        ++what.numMoved;
+    } else if (total != -1) { // kept: -1 is no answer to keep
+        (below == -1 ? what.askedOverUnset : what.asked).add(idx);
+    }
+    return total;
+}
+
+// Copies the field again, after writing down what was answered from the copy.
+void ElementIndex::renew(Summands& what) {
+    writeDown(what);
+    what.numMoved = 0;
+    what.copies.clear();
+    what.copies.reserve(numbering_.elements.size());
+    for (const StructElement* element : numbering_.elements)
+        what.copies.push_back(element->*what.field);
+}
+
+// --- Written answers -------------------------------------------------------------------------------------------------
+
+CachedElement& ElementIndex::written(long idx, bool takeOwnership) {
+    if (CachedElement* const found = findWritten(idx)) return *found;
+    StructElement* const element = askedElements_.contains(idx) ? this->element(idx) : nullptr;
+    const long offset = offsets_.wasAsked(idx) ? this->offset(idx) : -1;
+    const long varDimsOffset = varDimsOffsets_.wasAsked(idx) ? this->varDimsOffset(idx) : -1;
+    if (written_->empty()) noteEdit();
+    CachedElement& made = (*written_)[idx];
+    made.element = element;
+    made.offset = offset;
+    made.varDimsOffset = varDimsOffset;
+    if (takeOwnership && element) {
+        const Place at = place(idx);
+        const auto keeper = std::find_if(made_.begin(), made_.end(), [&](const auto& e) { return e.get() == element; });
+        if (keeper != made_.end() && (at.isRoot() || at.isHead(idx))) {
+            made.ownsElement = true;
+            keeper->release();
+            made_.erase(keeper);
+        }
+    }
+    return made;
+}
+
+void ElementIndex::writeDown(AskedSet& asked) {
+    asked.forEach([&](long idx) { written(idx, false); });
+    asked.reset(numbering_.numDFS);
+}
+
+void ElementIndex::writeDown(Summands& what) {
+    writeDown(what.asked);
+    writeDown(what.askedOverUnset);
+}
+
+bool ElementIndex::hasWrittenAnswersBelow() {
+    const unsigned long now = edits();
+    if (writtenCheckedAt_ == now) return hasWrittenBelow_;
+    writtenCheckedAt_ = now; // before the nested ones are asked: a faulty structure may contain itself
+    hasWrittenBelow_ = false;
+    bool found = !written_->empty();
+    for (const Nested& nested : numbering_.nested)
+        found = found || nested.index->current().hasWrittenAnswersBelow();
+    return hasWrittenBelow_ = found;
+}
+
+// As if element() had been called for every index below the limit.
+void ElementIndex::markElementsAnswered(long limit) {
+    const long end = std::min(limit, numbering_.numDFS);
+    const long from = std::max(askedElements_.below(), 1L);
+    for (long i = from < end ? numbering_.nodes.find(from) : numImmediate(); i < numImmediate(); ++i) {
+        const std::uint32_t position = numbering_.nestedAt[static_cast<std::size_t>(i)];
+        if (position == leaf) continue;
+        Nested& nested = numbering_.nested[position];
+        const long first = numbering_.nodes[i] + (nested.width > 1 ? 2 : 1);
+        if (first >= end) break;
+        const std::string& nameNow = immediate(i).name;
+        if (!nested.name) nested.name = nameNow;
+        if (*nested.name != nameNow) // instances that were not asked have the new name
+            for (long instance = 0; instance < std::max(nested.width, 1L) && first + instance * nested.numDFS < end;
+                 ++instance)
+                element(first + instance * nested.numDFS);
+        nested.index->current().markElementsAnswered(std::min(nested.numDFS, end - first));
+    }
+    askedElements_.addBelow(limit);
+}
+
+// --- Raw values and leaves -------------------------------------------------------------------------------------------
+
+long ElementIndex::elementAtRaw(long rawIdx, long from) const {
+    const long element = numbering_.raw.find(wrappingAdd(rawIdx, 1), from);
+    if (element == numImmediate() && !numbering_.isComplete) raiseInvalidType();
+    return element;
+}
+
+long ElementIndex::rawSpansBefore(long element) const {
+    if (element > numImmediate() && !numbering_.isComplete) raiseInvalidType();
+    return numbering_.raw[std::clamp(element, 0L, numImmediate())];
+}
+
+long ElementIndex::rawBefore(long idx) {
+    if (idx < 1) return 0;
+    if (hasWrittenAnswersBelow()) return rawBeforeInOrder(idx);
+    const long numNodes = numbering_.numDFS;
+    markElementsAnswered(idx);
+    if (numNodes <= 0) return 0;
+    if (idx <= numNodes) return rawWithin(idx);
+    return wrappingAdd(wrappingMultiply(idx / numNodes, rawWithin(numNodes)), rawWithin(idx % numNodes));
+}
+
+// Where answers are written down, each node may be another than the numbering says.
+long ElementIndex::rawBeforeInOrder(long idx) {
+    long raw = 0;
+    for (long i = 0; i < idx; ++i) {
+        const StructElement& node = *element(i);
+        if (node.dataTypeId != DATA_TYPE_ID_AUTO &&
+            table_->getDataTypeAliasedThruTo(node.dataTypeId)->getIsType(dtqStruct))
+            continue;
+        const long width = node.getWidth();
+        raw = wrappingAdd(raw, node.signalType == 1 ? wrappingMultiply(width, 2) : width);
+    }
+    return raw;
+}
+
+// For indices up to the number of nodes.
+long ElementIndex::rawWithin(long idx) {
+    if (idx <= 1) return 0;
+    readRaw();
+    const long element = numbering_.nodes.find(idx);
+    if (element == numImmediate()) {
+        if (!numbering_.isComplete) raiseInvalidType();
+        return rawBefore_.back();
+    }
+    const long before = rawBefore_[static_cast<std::size_t>(element)];
+    const Nested* const nested = nestedIn(element);
+    const long within = idx - numbering_.nodes[element] - 1;
+    if (!nested || within == 0) return before;
+    ElementIndex& index = nested->index->current();
+    if (nested->width <= 1) return wrappingAdd(before, index.rawWithin(within));
+    const long instance = (within - 1) / nested->numDFS;
+    return wrappingAdd(before, wrappingAdd(wrappingMultiply(instance, index.rawWithin(nested->numDFS)),
+                                           index.rawWithin((within - 1) % nested->numDFS)));
+}
+
+void ElementIndex::readRaw() {
+    if (rawReadAt_ == readAt_ && readAt_ == edits()) return;
+    rawReadAt_ = readAt_;
+    rawBefore_.assign(1, 0);
+    rawBefore_.reserve(numbering_.elements.size() + 1);
+    for (long i = 0; i < numImmediate(); ++i) {
+        if (numbering_.nodes[i + 1] >= numbering_.numDFS) break; // no index lies behind it
+        const Nested* const nested = nestedIn(i);
+        long raw = numbering_.raw[i + 1] - numbering_.raw[i];
+        if (nested) // kept: one instance for a width of 0 or less
+            raw = wrappingMultiply(std::max(nested->width, 1L), nested->index->current().rawWithin(nested->numDFS));
+        rawBefore_.push_back(wrappingAdd(rawBefore_.back(), raw));
+    }
+}
+
+std::vector<long> ElementIndex::leaves() {
+    std::vector<long> leaves;
+    const long numNodes = numbering_.numDFS;
+    if (!hasWrittenAnswersBelow()) {
+        markElementsAnswered(numNodes);
+        appendLeaves(leaves, 0, numNodes);
+        return leaves;
+    }
+    for (long idx = 0; idx < numNodes; ++idx) {
+        const int typeId = element(idx)->dataTypeId;
+        if (typeId == DATA_TYPE_ID_AUTO || !table_->getDataTypeAliasedThruTo(typeId)->getIsType(dtqStruct))
+            leaves.push_back(idx);
+    }
+    return leaves;
+}
+
+// Those below `limit` in this numbering, shifted by `base`.
+void ElementIndex::appendLeaves(std::vector<long>& leaves, long base, long limit) {
+    for (long i = 0; i < numImmediate(); ++i) {
+        const long first = numbering_.nodes[i] + 1;
+        if (first >= limit) return;
+        const Nested* const nested = nestedIn(i);
+        if (!nested) {
+            leaves.push_back(base + first);
+            continue;
+        }
+        if (nested->numDFS <= 0) continue;
+        ElementIndex& index = nested->index->current();
+        if (nested->width <= 1) {
+            index.appendLeaves(leaves, base + first, std::min(nested->numDFS, limit - first));
+            continue;
+        }
+        long start = first + 1; // behind the array node
+        for (long instance = 0; instance < nested->width && start < limit; ++instance, start += nested->numDFS)
+            index.appendLeaves(leaves, base + start, std::min(nested->numDFS, limit - start));
+    }
+    if (!numbering_.isComplete && numbering_.nodes.total() + 1 < limit) raiseInvalidType();
+}
+
+} // namespace QLTypeSys::structures
