@@ -19,8 +19,16 @@ struct Move {
 };
 
 struct ElementLayout {
-    ElementDescription description;
-    std::string typeLabel;
+    std::string name;
+    std::string typeName;
+    std::string typeLabel; ///< the type's name for people
+    std::vector<std::int64_t> dimensions;
+    bool isComplex = false;
+    bool isFrameBased = false;
+    bool hasVariableDimensions = false;
+    double min = 0; ///< -inf when there is none
+    double max = 0; ///< +inf when there is none
+    std::string unit;
     std::int64_t offset = 0;  ///< in bytes
     std::int64_t size = 0;    ///< in bytes, all values of the element
     std::int64_t padding = 0; ///< bytes behind it that belong to nobody

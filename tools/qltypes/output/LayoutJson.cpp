@@ -26,17 +26,16 @@ const char* keyOf(RefusalKind kind) {
 Json bound(double value) { return std::isfinite(value) ? Json(value) : Json(nullptr); }
 
 Json elementJson(const ElementLayout& element) {
-    const ElementDescription& description = element.description;
     Json json = {
-        {"name", description.name},
-        {"type", description.type.name},
-        {"dimensions", description.dimensions},
-        {"complex", description.isComplex},
-        {"sampling", description.isFrameBased ? "frame" : "sample"},
-        {"dimensionsMode", description.hasVariableDimensions ? "variable" : "fixed"},
-        {"min", bound(description.min)},
-        {"max", bound(description.max)},
-        {"unit", description.unit.empty() ? Json(nullptr) : Json(description.unit)},
+        {"name", element.name},
+        {"type", element.typeName},
+        {"dimensions", element.dimensions},
+        {"complex", element.isComplex},
+        {"sampling", element.isFrameBased ? "frame" : "sample"},
+        {"dimensionsMode", element.hasVariableDimensions ? "variable" : "fixed"},
+        {"min", bound(element.min)},
+        {"max", bound(element.max)},
+        {"unit", element.unit.empty() ? Json(nullptr) : Json(element.unit)},
         {"offset", element.offset},
         {"size", element.size},
         {"padding", element.padding},

@@ -10,7 +10,7 @@
 namespace inspector {
 namespace {
 
-std::string nameWithDimensions(const ElementDescription& element) {
+std::string nameWithDimensions(const ElementLayout& element) {
     std::string text = element.name;
     if (element.dimensions == std::vector<std::int64_t>{1}) return text;
     for (const std::int64_t dimension : element.dimensions)
@@ -19,13 +19,12 @@ std::string nameWithDimensions(const ElementDescription& element) {
 }
 
 std::string notesOf(const ElementLayout& element) {
-    const ElementDescription& description = element.description;
     std::vector<std::string> notes;
-    if (!description.unit.empty()) notes.push_back(fmt::format("unit {}", description.unit));
-    if (std::isfinite(description.min)) notes.push_back(fmt::format("min {}", description.min));
-    if (std::isfinite(description.max)) notes.push_back(fmt::format("max {}", description.max));
-    if (description.isFrameBased) notes.push_back("frame based");
-    if (description.hasVariableDimensions) notes.push_back("variable dimensions");
+    if (!element.unit.empty()) notes.push_back(fmt::format("unit {}", element.unit));
+    if (std::isfinite(element.min)) notes.push_back(fmt::format("min {}", element.min));
+    if (std::isfinite(element.max)) notes.push_back(fmt::format("max {}", element.max));
+    if (element.isFrameBased) notes.push_back("frame based");
+    if (element.hasVariableDimensions) notes.push_back("variable dimensions");
     if (element.move) notes.push_back(element.move->reason);
     return fmt::format("{}", fmt::join(notes, "; "));
 }
@@ -38,9 +37,9 @@ std::string structureText(const StructureLayout& structure, const Colours& colou
                      {"notes", Align::Left}});
     const auto number = [](std::int64_t value) { return std::to_string(value); };
     for (const ElementLayout& element : structure.elements) {
-        const std::string type = (element.description.isComplex ? "complex " : "") + element.typeLabel;
-        table.addRow({number(element.offset), number(element.size), nameWithDimensions(element.description), type,
-                      notesOf(element)});
+        const std::string type = (element.isComplex ? "complex " : "") + element.typeLabel;
+        table.addRow(
+            {number(element.offset), number(element.size), nameWithDimensions(element), type, notesOf(element)});
         if (element.padding == 0) continue;
         const bool isLast = &element == &structure.elements.back();
         table.addRow({number(element.offset + element.size), number(element.padding), "(padding)", "",

@@ -1,6 +1,7 @@
 #include "table/TypeLoader.h"
 
 #include <algorithm>
+#include <iterator>
 #include <stdexcept>
 
 #include <fmt/format.h>
@@ -82,9 +83,9 @@ int TypeLoader::idOf(const TypeReference& reference) {
 
 int TypeLoader::unitIdOf(const std::string& unit) {
     if (unit.empty()) return -1;
-    const auto at = std::find(units_.begin(), units_.end(), unit);
-    if (at == units_.end()) units_.push_back(unit);
-    return static_cast<int>(at - units_.begin());
+    const auto id = std::find(units_.begin(), units_.end(), unit) - units_.begin();
+    if (id == std::ssize(units_)) units_.push_back(unit);
+    return static_cast<int>(id);
 }
 
 void TypeLoader::registerType(const TypeDescription& type) {
@@ -137,33 +138,50 @@ void TypeLoader::load(const Description& description) {
         registerType(description.types[index]);
 }
 
-StructureLayout TypeLoader::structureLayout(const TypeDescription& type, const StructureDescription& structure) const {
+// What the table holds of an element, without asking the description.
+ElementLayout TypeLoader::elementLayout(const QLTypeSys::ImmediateElementAccess& view, long index,
+                                        std::int64_t endOfElementBefore) const {
+    const int typeId = view.getDataTypeId(index);
+    const int typeSize = DtGetDataTypeSize(&table_, typeId);
+    const int unitId = view.getUnitId(index);
+    const long* const dimensions = view.getDimensions(index);
+
+    ElementLayout element;
+    element.name = view.getName(index);
+    element.typeName = DtGetDataTypeName(&table_, typeId);
+    element.typeLabel = labelOf(element.typeName);
+    element.dimensions.assign(dimensions, dimensions + view.getNumDimensions(index));
+    element.isComplex = view.getSignalType(index) == 1;
+    element.isFrameBased = view.getSamplingMode(index) == 1;
+    element.hasVariableDimensions = view.getDimensionsMode(index) == 1;
+    element.min = view.getMin(index);
+    element.max = view.getMax(index);
+    if (unitId >= 0) element.unit = units_[static_cast<std::size_t>(unitId)];
+    element.offset = view.getOffset(index);
+    element.size = view.getComplexWidth(index) * typeSize;
+    element.padding = view.getPadding(index);
+    if (element.offset != endOfElementBefore) {
+        const bool isBuiltIn = DtCheckForBuiltInDataType(DtGetDataTypeIdAliasedThruTo(&table_, typeId));
+        element.move = moveOf(endOfElementBefore, typeSize, isBuiltIn);
+    }
+    return element;
+}
+
+StructureLayout TypeLoader::structureLayout(const TypeDescription& type) const {
     const int id = table_.getDataTypeId(type.name.c_str());
     const QLTypeSys::ImmediateElementAccess view(&table_, id);
-    StructureLayout layout{type.name,
-                           type.label,
-                           DtGetDataTypeSize(&table_, id),
-                           0,
-                           DtGetDataTypeNumFlatElements(&table_, id),
-                           DtGetDataTypeNumRawElements(&table_, id),
-                           DtGetDataTypeNumDFSElements(&table_, id),
-                           {}};
-    layout.elements.reserve(structure.elements.size());
+    StructureLayout layout;
+    layout.name = type.name;
+    layout.label = type.label;
+    layout.size = DtGetDataTypeSize(&table_, id);
+    layout.numFlatElements = DtGetDataTypeNumFlatElements(&table_, id);
+    layout.numRawElements = DtGetDataTypeNumRawElements(&table_, id);
+    layout.numDFSElements = DtGetDataTypeNumDFSElements(&table_, id);
     std::int64_t end = 0; // of the element before
     for (long i = 0; i < view.getNumElements(); ++i) {
-        const int typeId = view.getDataTypeId(i);
-        const int typeSize = DtGetDataTypeSize(&table_, typeId);
-        ElementLayout element;
-        element.description = structure.elements[static_cast<std::size_t>(i)];
-        element.typeLabel = labelOf(element.description.type.name);
-        element.offset = view.getOffset(i);
-        element.size = view.getComplexWidth(i) * typeSize;
-        element.padding = view.getPadding(i);
-        const bool isBuiltIn = DtCheckForBuiltInDataType(DtGetDataTypeIdAliasedThruTo(&table_, typeId));
-        if (element.offset != end) element.move = moveOf(end, typeSize, isBuiltIn);
-        end = element.offset + element.size;
-        layout.padding += element.padding;
-        layout.elements.push_back(std::move(element));
+        layout.elements.push_back(elementLayout(view, i, end));
+        end = layout.elements.back().offset + layout.elements.back().size;
+        layout.padding += layout.elements.back().padding;
     }
     return layout;
 }
@@ -182,8 +200,8 @@ Layout TypeLoader::layout(const Description& description) const {
     for (const std::string& name : numberTypes_)
         layout.otherTypes.push_back(otherType(name, "number"));
     for (const TypeDescription& type : description.types) {
-        if (const auto* structure = std::get_if<StructureDescription>(&type.kind)) {
-            layout.structures.push_back(structureLayout(type, *structure));
+        if (std::holds_alternative<StructureDescription>(type.kind)) {
+            layout.structures.push_back(structureLayout(type));
         } else if (const auto* alias = std::get_if<AliasDescription>(&type.kind)) {
             layout.otherTypes.push_back(otherType(type.name, "alias"));
             layout.otherTypes.back().target = labelOf(alias->target.name);

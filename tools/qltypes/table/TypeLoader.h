@@ -12,6 +12,7 @@
 
 #include "description/Description.h"
 #include "output/Layout.h"
+#include "qltypes/structures/ElementAccess.h"
 #include "qltypes/types/DataTypeTable.h"
 
 namespace inspector {
@@ -37,7 +38,9 @@ class TypeLoader {
     void fillElement(int structureId, long index, const ElementDescription& element);
     int unitIdOf(const std::string& unit);
 
-    StructureLayout structureLayout(const TypeDescription& type, const StructureDescription& structure) const;
+    ElementLayout elementLayout(const QLTypeSys::ImmediateElementAccess& view, long index,
+                                std::int64_t endOfElementBefore) const;
+    StructureLayout structureLayout(const TypeDescription& type) const;
     OtherType otherType(const std::string& name, const char* kind) const;
     std::string labelOf(const std::string& name) const;
 
