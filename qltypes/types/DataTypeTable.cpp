@@ -374,16 +374,19 @@ int DataTypeTable::enter(std::unique_ptr<DataType> record, int existing, const c
     DataType* const entered = record.get();
     addDataType(entered);
     record.release();
-    try {
-        if (complete) complete();
-    } catch (...) {
-        if (existing == DATA_TYPE_ID_INVALID) dataTypeIdsByName_->erase(entered->getName());
-        dataTypes_.pop_back();
-        delete entered;
-        throw;
-    }
+    const auto orTakeBack = [&](const auto& work) {
+        try {
+            work();
+        } catch (...) {
+            if (existing == DATA_TYPE_ID_INVALID) dataTypeIdsByName_->erase(entered->getName());
+            dataTypes_.pop_back();
+            delete entered;
+            throw;
+        }
+    };
+    if (complete) orTakeBack(complete);
     checkWithClient(entered, blockName);
-    if (existing != DATA_TYPE_ID_INVALID) replaceDataType(recordAt(existing), entered);
+    if (existing != DATA_TYPE_ID_INVALID) orTakeBack([&] { replaceDataType(recordAt(existing), entered); });
     return entered->getId();
 }
 

@@ -348,7 +348,7 @@ class QL_EXPORT DataTypeTable {
     bool isRegisteredAlready(const char* name, DataTypeSource source, int& existing) const;
     int nextId() const { return getNumDataTypes() - 1; }
     /// Last steps of every registration: add, complete what needs the record in its place, let the client check,
-    /// replace `existing` unless it is -10. What `complete` throws undoes the registration.
+    /// replace `existing` unless it is -10. What is thrown on the way undoes the registration.
     int enter(std::unique_ptr<DataType> record, int existing, const char* blockName,
               const std::function<void()>& complete = {});
     void checkWithClient(DataType* record, const char* blockName);

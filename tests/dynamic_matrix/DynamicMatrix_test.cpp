@@ -10,7 +10,7 @@
 
 #include "qltypes/dynamic_matrix/DynamicMatrix.h"
 #include "qltypes/dynamic_matrix/DynamicMatrixMemoryManager.h"
-#include "tests/dynamic_matrix/FailingNew.h"
+#include "tests/support/FailingNew.h"
 
 namespace {
 
@@ -82,12 +82,12 @@ TEST(DynamicMatrix, SettingTheSameChangesNothing) {
     DynamicMatrix m;
     update(m, {10, 10});
     void* const before = m.rawData;
-    testsupport::failNewAt(1);
+    testsupport::failNothrowNewAt(1);
     m.setDims({10, 10});
     m.setDim(0, 10);
     DynamicMatrix::updateDataDimFcn(1, 10, &m);
     update(m, {10, 10}, 999); // the element size is not looked at
-    testsupport::failNewAt(0);
+    testsupport::failNothrowNewAt(0);
     EXPECT_EQ(m.rawData, before);
     EXPECT_EQ(m.elementSize, 8u);
     EXPECT_TRUE(isManaged(m));
@@ -105,9 +105,9 @@ TEST(DynamicMatrix, ASmallChangeKeepsTheBuffer) {
         update(m, {100}, 1);
         void* const before = m.rawData;
         std::memset(m.rawData, 7, 100);
-        testsupport::failNewAt(1); // a buffer that moves is a buffer that fails
+        testsupport::failNothrowNewAt(1); // a buffer that moves is a buffer that fails
         DynamicMatrix::updateDataDimFcn(0, row.dim, &m);
-        testsupport::failNewAt(0);
+        testsupport::failNothrowNewAt(0);
         EXPECT_EQ(m.rawData, row.stays ? before : nullptr);
         if (row.stays) {
             EXPECT_EQ(static_cast<const unsigned char*>(m.rawData)[65], 7);
@@ -372,7 +372,7 @@ TEST(DynamicMatrix, AByteWiseCopyCannotReleaseTheBufferOfItsOwner) {
 TEST(DynamicMatrix, AFailedAllocationLeavesARecordWithoutABuffer) {
     const char data[] = "0123456789";
     DynamicMatrix m;
-    testsupport::failNewAt(1);
+    testsupport::failNothrowNewAt(1);
     construct(m, {10}, 1, data); // nothing is written
     EXPECT_EQ(m.rawData, nullptr);
     EXPECT_THAT(m.dims, ElementsAre(10));
@@ -382,7 +382,7 @@ TEST(DynamicMatrix, AFailedAllocationLeavesARecordWithoutABuffer) {
     construct(m, {10}, 1, data);
     EXPECT_EQ(std::memcmp(m.rawData, data, 10), 0);
 
-    testsupport::failNewAt(1);
+    testsupport::failNothrowNewAt(1);
     DynamicMatrix to;
     DynamicMatrix::copyFcn(&to, &m);
     EXPECT_EQ(to.rawData, nullptr);
@@ -436,9 +436,9 @@ TEST(DynamicMatrix, AgreesWithAPlainModelOverARandomSequence) {
             break;
         }
         case 2:
-            if (random() % 50 == 0) testsupport::failNewAt(1);
+            if (random() % 50 == 0) testsupport::failNothrowNewAt(1);
             construct(m, dims, sizeof(int), contents.data());
-            testsupport::failNewAt(0);
+            testsupport::failNothrowNewAt(0);
             if (!m.rawData) manager().Deallocate({&m, nullptr}); // a failed request would bind later ones
             model = {dims, contents, m.rawData != nullptr};
             break;

@@ -7,7 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "qltypes/dynamic_matrix/DynamicMatrixMemoryManager.h"
-#include "tests/dynamic_matrix/FailingNew.h"
+#include "tests/support/FailingNew.h"
 
 namespace {
 
@@ -72,9 +72,9 @@ TEST(MemoryManager, ABlockMovesExactlyOutsideItsBounds) {
     int owner;
     const auto movesAt = [&](unsigned long request) {
         const Key key = manager().Allocate(&owner, 100);
-        testsupport::failNewAt(1);
+        testsupport::failNothrowNewAt(1);
         const Key got = manager().GetOrAllocate(key, request);
-        testsupport::failNewAt(0);
+        testsupport::failNothrowNewAt(0);
         manager().Deallocate(got);
         return got.second == nullptr;
     };
@@ -127,7 +127,7 @@ TEST(MemoryManager, AFailedAllocationIsManagedLikeAnyOther) {
     const Key kept = manager().Allocate(&other, 16);
     std::memcpy(kept.second, "still here", 11);
 
-    testsupport::failNewAt(1);
+    testsupport::failNothrowNewAt(1);
     const Key none = manager().Allocate(&owner, 100);
     EXPECT_EQ(none, Key(&owner, nullptr));
     EXPECT_TRUE(manager().IsManaging(none));
@@ -136,10 +136,10 @@ TEST(MemoryManager, AFailedAllocationIsManagedLikeAnyOther) {
     EXPECT_NE(block.second, nullptr);
     EXPECT_FALSE(manager().IsManaging(none));
 
-    testsupport::failNewAt(1);
+    testsupport::failNothrowNewAt(1);
     EXPECT_EQ(manager().GetOrAllocate(block, 1000), none); // the old block goes first
     EXPECT_FALSE(manager().IsManaging(block));
-    testsupport::failNewAt(1);
+    testsupport::failNothrowNewAt(1);
     EXPECT_EQ(manager().Allocate(&owner, 10), none);
     EXPECT_EQ(manager().GetOrAllocate(none, 15), none); // by the bounds of the last request
     EXPECT_STREQ(static_cast<const char*>(kept.second), "still here");
