@@ -63,7 +63,7 @@ TEST(TimeZone, TextAndSecondsOfEveryFieldValue) {
         for (int minutes = -128; minutes <= 127; ++minutes) {
             const TimeZone zone(static_cast<signed char>(hours), static_cast<signed char>(minutes));
             ASSERT_EQ(zone.getOffsetSecond(), hours * 3600 + minutes * 60);
-            char text[16];
+            char text[32];
             std::snprintf(text, sizeof text, "%c%02d:%02d", hours < 0 || minutes < 0 ? '-' : '+', std::abs(hours),
                           std::abs(minutes));
             const std::string expected = text;
