@@ -1,0 +1,261 @@
+#include "qlplatform/symbolic/Polynomial_internal.h"
+
+#include <algorithm>
+#include <limits>
+
+namespace QL {
+namespace {
+
+// The factors of a product of two monomials. False when an exponent is beyond its limit.
+bool multiplyFactors(std::span<const Factor> a, std::span<const Factor> b, std::vector<Factor>& product) {
+    product.clear();
+    auto inA = a.begin();
+    auto inB = b.begin();
+    while (inA != a.end() && inB != b.end()) {
+        if (inA->atom < inB->atom) {
+            product.push_back(*inA++);
+        } else if (inB->atom < inA->atom) {
+            product.push_back(*inB++);
+        } else {
+            const std::uint64_t exponent = inA->exponent + inB->exponent;
+            if (exponent > limits::exponent) return false;
+            product.push_back({inA->atom, exponent});
+            ++inA;
+            ++inB;
+        }
+    }
+    product.insert(product.end(), inA, a.end());
+    product.insert(product.end(), inB, b.end());
+    return true;
+}
+
+} // namespace
+
+std::uint64_t Polynomial::degreeOf(std::span<const Factor> factors) {
+    std::uint64_t degree = 0;
+    for (const Factor& f : factors)
+        if (__builtin_add_overflow(degree, f.exponent, &degree)) return std::numeric_limits<std::uint64_t>::max();
+    return degree;
+}
+
+int Polynomial::compareMonomials(std::uint64_t degreeA, std::span<const Factor> a, std::uint64_t degreeB,
+                                 std::span<const Factor> b) {
+    if (degreeA != degreeB) return degreeA > degreeB ? -1 : 1;
+    const std::size_t common = std::min(a.size(), b.size());
+    for (std::size_t i = 0; i < common; ++i) {
+        if (a[i].atom != b[i].atom) return a[i].atom < b[i].atom ? -1 : 1;
+        if (a[i].exponent != b[i].exponent) return a[i].exponent > b[i].exponent ? -1 : 1;
+    }
+    return a.size() == b.size() ? 0 : (a.size() > b.size() ? -1 : 1);
+}
+
+Polynomial::Polynomial(Integer constant) {
+    if (!constant.isZero()) append(std::move(constant), {});
+}
+
+Polynomial::Polynomial(NodeId atom) {
+    const Factor factor{atom, 1};
+    append(Integer(1), {&factor, 1});
+}
+
+Polynomial::Polynomial(Integer coefficient, std::span<const Factor> factors) {
+    append(std::move(coefficient), factors);
+}
+
+void Polynomial::append(Integer coefficient, std::span<const Factor> factors) {
+    const auto first = static_cast<std::uint32_t>(factors_.size());
+    factors_.insert(factors_.end(), factors.begin(), factors.end());
+    terms_.push_back({std::move(coefficient), first, static_cast<std::uint32_t>(factors.size()), degreeOf(factors)});
+    ++numOrdered_;
+}
+
+bool Polynomial::precedes(const Term& a, const Term& b) const {
+    return compareMonomials(a.degree, factors(a), b.degree, factors(b)) < 0;
+}
+
+bool operator==(const Polynomial& a, const Polynomial& b) {
+    return std::equal(a.terms_.begin(), a.terms_.end(), b.terms_.begin(), b.terms_.end(),
+                      [&](const Polynomial::Term& s, const Polynomial::Term& t) {
+                          const auto f = a.factors(s);
+                          const auto g = b.factors(t);
+                          return s.coefficient == t.coefficient && std::equal(f.begin(), f.end(), g.begin(), g.end());
+                      });
+}
+
+Integer Polynomial::content() const {
+    Integer divisor;
+    for (const Term& t : terms_) {
+        divisor = Integer::gcd(divisor, t.coefficient);
+        if (divisor.isOne()) break;
+    }
+    return divisor;
+}
+
+void Polynomial::divideExactly(const Integer& divisor) {
+    if (divisor.isOne()) return;
+    for (Term& t : terms_)
+        t.coefficient.divideExactly(divisor);
+}
+
+void Polynomial::add(const Polynomial& other, bool negated) {
+    const bool changesSign = negated != (other.isNegated_ != isNegated_);
+    for (const Term& t : other.terms_) {
+        const auto added = other.factors(t);
+        Integer coefficient = changesSign ? -t.coefficient : t.coefficient;
+        if (numOrdered_ == terms_.size()) { // everything so far is in order: perhaps this one is, too
+            const int order =
+                terms_.empty() ? -1 : compareMonomials(terms_.back().degree, factors(terms_.back()), t.degree, added);
+            if (order < 0) {
+                append(std::move(coefficient), added);
+                continue;
+            }
+            if (order == 0) {
+                terms_.back().coefficient += coefficient;
+                if (terms_.back().coefficient.isZero()) {
+                    terms_.pop_back();
+                    --numOrdered_;
+                }
+                continue;
+            }
+        }
+        const auto first = static_cast<std::uint32_t>(factors_.size());
+        factors_.insert(factors_.end(), added.begin(), added.end());
+        terms_.push_back({std::move(coefficient), first, t.numFactors, t.degree});
+    }
+    // What waits is put in order when it outgrows what is: each term is then moved a logarithmic number of times.
+    if (terms_.size() - numOrdered_ > numOrdered_ + 32) normalize();
+}
+
+void Polynomial::normalize() {
+    if (isNegated_) {
+        for (Term& t : terms_)
+            t.coefficient.negate();
+        isNegated_ = false;
+    }
+    if (numOrdered_ == terms_.size()) return;
+    const auto before = [this](const Term& a, const Term& b) { return precedes(a, b); };
+    const auto middle = terms_.begin() + static_cast<std::ptrdiff_t>(numOrdered_);
+    std::sort(middle, terms_.end(), before);
+    std::inplace_merge(terms_.begin(), middle, terms_.end(), before);
+    auto kept = terms_.begin();
+    for (auto t = terms_.begin(); t != terms_.end();) {
+        auto like = t + 1;
+        for (; like != terms_.end() && !before(*t, *like); ++like)
+            t->coefficient += like->coefficient;
+        if (!t->coefficient.isZero()) {
+            if (kept != t) *kept = std::move(*t);
+            ++kept;
+        }
+        t = like;
+    }
+    terms_.erase(kept, terms_.end());
+    numOrdered_ = terms_.size();
+    compactFactors();
+}
+
+// Drops the factors of terms that are gone, once they are the larger part.
+void Polynomial::compactFactors() {
+    std::size_t used = 0;
+    for (const Term& t : terms_)
+        used += t.numFactors;
+    if (factors_.size() <= 2 * used + 16) return;
+    boost::container::small_vector<Factor, 3> kept;
+    kept.reserve(used);
+    for (Term& t : terms_) {
+        const auto own = factors(t);
+        const auto first = static_cast<std::uint32_t>(kept.size());
+        kept.insert(kept.end(), own.begin(), own.end());
+        t.firstFactor = first;
+    }
+    factors_ = std::move(kept);
+}
+
+std::size_t Polynomial::numWords() const {
+    std::size_t words = terms_.size();
+    for (const Term& t : terms_)
+        words += t.numFactors;
+    return words;
+}
+
+std::size_t Polynomial::maxBits() const {
+    std::size_t bits = 0;
+    for (const Term& t : terms_)
+        bits = std::max(bits, t.coefficient.numBits());
+    return bits;
+}
+
+bool Polynomial::isProductWithinLimits(const Polynomial& other) const {
+    const std::size_t bits = maxBits() + other.maxBits();
+    if (bits > limits::coefficientBits) return false;
+    const std::size_t numProducts = terms_.size() * other.terms_.size();
+    if (numProducts == 1 || isConstant() || other.isConstant()) return true;
+    const std::size_t words =
+        numWords() * other.terms_.size() + other.numWords() * terms_.size() - numProducts + numProducts * (bits / 64);
+    return words <= limits::productWords;
+}
+
+std::optional<Polynomial> Polynomial::product(const Polynomial& a, const Polynomial& b) {
+    if (a.isZero() || b.isZero()) return Polynomial();
+    if (!a.isProductWithinLimits(b)) return std::nullopt;
+    return fullProduct(a, b);
+}
+
+std::optional<Polynomial> Polynomial::fullProduct(const Polynomial& a, const Polynomial& b) {
+    Polynomial result;
+    result.terms_.reserve(a.terms_.size() * b.terms_.size());
+    std::vector<Factor> factors;
+    for (const Term& s : a.terms_) {
+        for (const Term& t : b.terms_) {
+            if (!multiplyFactors(a.factors(s), b.factors(t), factors)) return std::nullopt;
+            result.append(s.coefficient * t.coefficient, factors);
+        }
+    }
+    // One term times an ordered polynomial is in order; rows of several are not.
+    if (a.terms_.size() > 1 && b.terms_.size() > 1) {
+        result.numOrdered_ = b.terms_.size();
+        result.normalize();
+    }
+    return result;
+}
+
+std::optional<Polynomial> Polynomial::power(const Polynomial& base, std::uint64_t exponent) {
+    if (exponent == 0) return Polynomial(Integer(1));
+    if (base.terms_.size() == 1 && (base.terms_[0].coefficient.isOne() || base.terms_[0].coefficient.isMinusOne())) {
+        std::vector<Factor> factors(base.factors_.begin(), base.factors_.end());
+        for (Factor& f : factors)
+            if (exponent > limits::exponent || __builtin_mul_overflow(f.exponent, exponent, &f.exponent) ||
+                f.exponent > limits::exponent)
+                return std::nullopt;
+        const bool isNegative = base.terms_[0].coefficient.sign() < 0 && exponent % 2 == 1;
+        return Polynomial(Integer(isNegative ? -1 : 1), factors);
+    }
+    std::optional<Polynomial> square = base;
+    std::optional<Polynomial> result;
+    for (;;) {
+        if (exponent % 2 == 1) {
+            result = result ? product(*result, *square) : square;
+            if (!result) return std::nullopt;
+        }
+        exponent /= 2;
+        if (exponent == 0) return result;
+        square = product(*square, *square);
+        if (!square) return std::nullopt;
+    }
+}
+
+bool Polynomial::multiplyInPlace(const Polynomial& other) {
+    if (terms_.size() != 1 || other.terms_.size() != 1 || !isOrdered() || !other.isOrdered()) return false;
+    Term& own = terms_[0];
+    const auto added = other.factors(other.terms_[0]);
+    if (own.firstFactor != 0 || own.numFactors != factors_.size()) return false;
+    if (!factors_.empty() && !added.empty() && factors_.back().atom >= added.front().atom) return false;
+    if (own.coefficient.numBits() + other.terms_[0].coefficient.numBits() > limits::coefficientBits) return false;
+    own.coefficient *= other.terms_[0].coefficient;
+    factors_.insert(factors_.end(), added.begin(), added.end());
+    own.numFactors = static_cast<std::uint32_t>(factors_.size());
+    if (__builtin_add_overflow(own.degree, other.terms_[0].degree, &own.degree))
+        own.degree = std::numeric_limits<std::uint64_t>::max();
+    return true;
+}
+
+} // namespace QL

@@ -1,0 +1,235 @@
+#include "qlplatform/symbolic/SymbolicExprPrinter.h"
+
+#include <charconv>
+#include <cmath>
+#include <string_view>
+#include <vector>
+
+#include "qlplatform/symbolic/NodeStore_internal.h"
+
+namespace QL {
+namespace {
+
+// How tightly operators bind, loosest first. An operator of some level takes operands of that level and above.
+enum Level : int {
+    orLevel,
+    andLevel,
+    equalLevel,
+    orderLevel,
+    sumLevel,
+    productLevel,
+    signLevel,
+    powerLevel,
+    atomLevel
+};
+
+// One way to write an operator: between its operands, or as a function when `level` is atomLevel.
+struct Spelling {
+    std::string_view text;
+    Level level;
+};
+
+class TextWriter {
+  public:
+    TextWriter(const SymbolicExprTable& table, const SymbolicExprPrinterPredicate& predicate, bool hostOperators,
+               bool hostNumbers, bool hostFunctions)
+        : table_(table), store_(table.nodes()), predicate_(predicate), hostOperators_(hostOperators),
+          hostNumbers_(hostNumbers), hostFunctions_(hostFunctions) {}
+
+    std::string write(NodeId root) {
+        open_.push_back({root, orLevel, {}});
+        while (!open_.empty() && text_.size() <= SymbolicExprPrinter::maxTextLength) {
+            const Piece piece = open_.back();
+            open_.pop_back();
+            if (piece.node == noNode)
+                text_ += piece.text;
+            else
+                writeNode(piece.node, piece.level);
+        }
+        if (text_.size() > SymbolicExprPrinter::maxTextLength) {
+            text_.resize(SymbolicExprPrinter::maxTextLength);
+            text_ += "...";
+        }
+        return std::move(text_);
+    }
+
+  private:
+    // What is still to be written: a node where `level` may stand, or a text.
+    struct Piece {
+        NodeId node;
+        Level level;
+        std::string_view text;
+    };
+
+    void later(std::string_view text) { open_.push_back({noNode, orLevel, text}); }
+    void later(NodeId node, Level level) { open_.push_back({node, level, {}}); }
+
+    void writeNode(NodeId id, Level allowed) {
+        const std::size_t numOperands = store_.numOperands(id);
+        const SymbolicOp op = store_.op(id);
+        if (op == SymbolicOp::ND) return writeList(id, "[", " ", "]");
+        if (numOperands == 0) return writeTerminal(id, allowed);
+        const Spelling spelling = spellingOf(op);
+        if (spelling.level == atomLevel) {
+            text_ += spelling.text;
+            return writeList(id, "(", ", ", ")");
+        }
+        const bool isEnclosed = spelling.level < allowed;
+        if (isEnclosed) {
+            text_ += '(';
+            later(")");
+        }
+        if (numOperands == 1) {
+            text_ += spelling.text;
+            // Two signs in a row would read as another operator.
+            later(store_.operand(id, 0), op == SymbolicOp::UnaryMinus ? powerLevel : signLevel);
+            return;
+        }
+        later(store_.operand(id, 1), static_cast<Level>(spelling.level + 1));
+        later(spelling.text);
+        later(store_.operand(id, 0), spelling.level);
+    }
+
+    void writeList(NodeId id, std::string_view before, std::string_view between, std::string_view after) {
+        text_ += before;
+        later(after);
+        for (std::size_t i = store_.numOperands(id); i-- > 0;) {
+            later(store_.operand(id, i), orLevel);
+            if (i > 0) later(between);
+        }
+    }
+
+    void writeTerminal(NodeId id, Level allowed) {
+        if (store_.op(id) == SymbolicOp::StringSymbol) {
+            text_ += predicate_.identifier(table_, id);
+            return;
+        }
+        if (store_.op(id) == SymbolicOp::BoolSymbol) {
+            text_ += store_.boolValue(id) ? "true" : "false";
+            return;
+        }
+        const std::string number = store_.op(id) == SymbolicOp::IntValue ? std::to_string(store_.intValue(id))
+                                                                         : doubleText(store_.doubleValue(id));
+        const bool isEnclosed = number.front() == '-' && allowed > signLevel;
+        text_ += isEnclosed ? "(" + number + ")" : number;
+    }
+
+    std::string doubleText(double value) const {
+        if (std::isnan(value)) return hostNumbers_ ? "NaN" : "nan";
+        if (std::isinf(value)) return std::string(value < 0 ? "-" : "") + (hostNumbers_ ? "Inf" : "inf");
+        char digits[32];
+        const auto end = std::to_chars(std::begin(digits), std::end(digits), value).ptr;
+        std::string text(digits, end);
+        if (!hostNumbers_ && text.find_first_of(".e") == std::string::npos) text += ".0";
+        return text;
+    }
+
+    Spelling spellingOf(SymbolicOp op) const {
+        switch (op) {
+        case SymbolicOp::UnaryMinus:
+            return {"-", signLevel};
+        case SymbolicOp::Plus:
+            return {" + ", sumLevel};
+        case SymbolicOp::Minus:
+            return {" - ", sumLevel};
+        case SymbolicOp::Multiply:
+            return {"*", productLevel};
+        case SymbolicOp::Divide:
+            return {"/", productLevel};
+        case SymbolicOp::Modulo:
+            return hostOperators_ ? Spelling{"rem", atomLevel} : Spelling{" % ", productLevel};
+        case SymbolicOp::Power:
+            return hostOperators_ ? Spelling{"^", powerLevel} : Spelling{"pow", atomLevel};
+        case SymbolicOp::Equal: // the host language ranks all comparisons alike
+            return {" == ", hostOperators_ ? orderLevel : equalLevel};
+        case SymbolicOp::NotEqual:
+            return hostOperators_ ? Spelling{" ~= ", orderLevel} : Spelling{" != ", equalLevel};
+        case SymbolicOp::LessThan:
+            return {" < ", orderLevel};
+        case SymbolicOp::LessThanOrEqual:
+            return {" <= ", orderLevel};
+        case SymbolicOp::GreaterThan:
+            return {" > ", orderLevel};
+        case SymbolicOp::GreaterThanOrEqual:
+            return {" >= ", orderLevel};
+        case SymbolicOp::And:
+            return {" && ", andLevel};
+        case SymbolicOp::Or:
+            return {" || ", orLevel};
+        case SymbolicOp::Not:
+            return {hostOperators_ ? "~" : "!", signLevel};
+        case SymbolicOp::Min:
+            return {"min", atomLevel};
+        case SymbolicOp::Max:
+            return {"max", atomLevel};
+        case SymbolicOp::Abs:
+            return {"abs", atomLevel};
+        case SymbolicOp::Floor:
+            return {"floor", atomLevel};
+        case SymbolicOp::Ceil:
+            return {"ceil", atomLevel};
+        case SymbolicOp::Round:
+            return {"round", atomLevel};
+        case SymbolicOp::Fix:
+            return {hostFunctions_ ? "fix" : "trunc", atomLevel};
+        case SymbolicOp::Mod:
+            return {"mod", atomLevel};
+        case SymbolicOp::Rem:
+            return {"rem", atomLevel};
+        case SymbolicOp::StringSymbol:
+        case SymbolicOp::IntValue:
+        case SymbolicOp::DoubleValue:
+        case SymbolicOp::BoolSymbol:
+        case SymbolicOp::ND:
+            break;
+        }
+        return {"", atomLevel};
+    }
+
+    const SymbolicExprTable& table_;
+    const NodeStore& store_;
+    const SymbolicExprPrinterPredicate& predicate_;
+    bool hostOperators_;
+    bool hostNumbers_;
+    bool hostFunctions_;
+    std::vector<Piece> open_;
+    std::string text_;
+};
+
+} // namespace
+
+SymbolicExprPrinterPredicate::~SymbolicExprPrinterPredicate() = default;
+
+std::string SymbolicExprAliasPrinterPredicate::identifier(const SymbolicExprTable&, unsigned long symbolId) const {
+    // A chain of bindings that comes round ends after as many steps as there are expressions.
+    for (unsigned long steps = 0; steps < table_.getNumExprs(); ++steps) {
+        const unsigned long value = table_.getValueId(symbolId);
+        if (SymbolicExprTable::isUnsetValue(value) || table_.get(value).getOp() != SymbolicOp::StringSymbol) break;
+        symbolId = value;
+    }
+    return table_.get(symbolId).getName();
+}
+
+const SymbolicExprPrinter::Predicate& SymbolicExprPrinter::Predicate::instance() {
+    static const Predicate shared;
+    return shared;
+}
+
+std::string SymbolicExprPrinter::Predicate::identifier(const SymbolicExprTable& table, unsigned long symbolId) const {
+    return table.get(symbolId).getName();
+}
+
+SymbolicExprPrinter::SymbolicExprPrinter(const SymbolicExprTable& table, const SymbolicExprPrinterPredicate& predicate,
+                                         bool hostOperators, bool hostNumbers, bool hostFunctions, Cache cache)
+    : table_(table), predicate_(predicate), hostOperators_(hostOperators), hostNumbers_(hostNumbers),
+      hostFunctions_(hostFunctions), cache_(std::move(cache)) {}
+
+std::string SymbolicExprPrinter::operator()(const SymbolicExpr& expr) {
+    const unsigned long id = expr.getId(table_);
+    const auto [at, isNew] = cache_.try_emplace(id);
+    if (isNew)
+        at->second = TextWriter(table_, predicate_, hostOperators_, hostNumbers_, hostFunctions_).write(nodeIdOf(id));
+    return at->second;
+}
+
+} // namespace QL
