@@ -154,7 +154,7 @@ std::size_t NodeStore::sizeInMemory() const {
     const std::size_t set = ids_.bucket_count() * sizeof(NodeId) + ids_.bucket_count() * 16 / 15;
     const std::size_t values = values_.bucket_count() * sizeof(void*) + values_.size() * 4 * sizeof(void*);
     return records_.capacity() * sizeof(Record) + pool_.capacity() * sizeof(NodeId) + set + values +
-           slots_.sizeInMemory() + simplifierSlots_.sizeInMemory();
+           slots_.sizeInMemory();
 }
 
 } // namespace QL

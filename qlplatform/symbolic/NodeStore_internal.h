@@ -97,8 +97,6 @@ class NodeStore {
 
     /// Slots for a walk that runs from begin to end without another one inside it.
     NodeSlots& slots() { return slots_; }
-    /// The slots of the simplifier, which adds nodes while it walks.
-    NodeSlots& simplifierSlots() { return simplifierSlots_; }
 
     std::size_t sizeInMemory() const;
 
@@ -155,7 +153,6 @@ class NodeStore {
     boost::unordered_flat_set<NodeId, KeyHash, KeyEqual> ids_;
     std::unordered_map<NodeId, NodeId> values_; // symbol to what it is bound to
     NodeSlots slots_;
-    NodeSlots simplifierSlots_;
 };
 
 inline NodeId nodeIdOf(unsigned long exprId) { return static_cast<NodeId>(exprId); }

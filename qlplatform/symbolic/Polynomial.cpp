@@ -6,8 +6,10 @@
 namespace QL {
 namespace {
 
+using FactorList = boost::container::small_vector<Factor, 8>;
+
 // The factors of a product of two monomials. False when an exponent is beyond its limit.
-bool multiplyFactors(std::span<const Factor> a, std::span<const Factor> b, std::vector<Factor>& product) {
+bool multiplyFactors(std::span<const Factor> a, std::span<const Factor> b, FactorList& product) {
     product.clear();
     auto inA = a.begin();
     auto inB = b.begin();
@@ -203,11 +205,11 @@ std::optional<Polynomial> Polynomial::product(const Polynomial& a, const Polynom
 std::optional<Polynomial> Polynomial::fullProduct(const Polynomial& a, const Polynomial& b) {
     Polynomial result;
     result.terms_.reserve(a.terms_.size() * b.terms_.size());
-    std::vector<Factor> factors;
+    FactorList factors;
     for (const Term& s : a.terms_) {
         for (const Term& t : b.terms_) {
             if (!multiplyFactors(a.factors(s), b.factors(t), factors)) return std::nullopt;
-            result.append(s.coefficient * t.coefficient, factors);
+            result.append(s.coefficient * t.coefficient, {factors.data(), factors.size()});
         }
     }
     // One term times an ordered polynomial is in order; rows of several are not.
@@ -220,40 +222,42 @@ std::optional<Polynomial> Polynomial::fullProduct(const Polynomial& a, const Pol
 
 std::optional<Polynomial> Polynomial::power(const Polynomial& base, std::uint64_t exponent) {
     if (exponent == 0) return Polynomial(Integer(1));
-    if (base.terms_.size() == 1 && (base.terms_[0].coefficient.isOne() || base.terms_[0].coefficient.isMinusOne())) {
-        std::vector<Factor> factors(base.factors_.begin(), base.factors_.end());
-        for (Factor& f : factors)
-            if (exponent > limits::exponent || __builtin_mul_overflow(f.exponent, exponent, &f.exponent) ||
-                f.exponent > limits::exponent)
-                return std::nullopt;
-        const bool isNegative = base.terms_[0].coefficient.sign() < 0 && exponent % 2 == 1;
-        return Polynomial(Integer(isNegative ? -1 : 1), factors);
+    if (base.terms_.size() > 1) { // one factor a step: a product of two large powers makes many like terms
+        std::optional<Polynomial> result = base;
+        for (std::uint64_t i = 1; result && i < exponent; ++i)
+            result = product(*result, base);
+        return result;
     }
-    std::optional<Polynomial> square = base;
-    std::optional<Polynomial> result;
-    for (;;) {
-        if (exponent % 2 == 1) {
-            result = result ? product(*result, *square) : square;
-            if (!result) return std::nullopt;
-        }
-        exponent /= 2;
-        if (exponent == 0) return result;
-        square = product(*square, *square);
-        if (!square) return std::nullopt;
-    }
+    if (base.isZero()) return Polynomial();
+    const Term& t = base.terms_[0];
+    std::vector<Factor> factors(base.factors(t).begin(), base.factors(t).end());
+    for (Factor& f : factors)
+        if (__builtin_mul_overflow(f.exponent, exponent, &f.exponent) || f.exponent > limits::exponent)
+            return std::nullopt;
+    const std::size_t bits = t.coefficient.numBits();
+    if (bits > 1 && exponent > limits::coefficientBits / bits) return std::nullopt;
+    Integer coefficient(bits == 1 && exponent % 2 == 0 ? 1 : t.coefficient.sign());
+    if (bits > 1) fmpz_pow_ui(coefficient.get(), t.coefficient.get(), exponent);
+    return Polynomial(std::move(coefficient), factors);
 }
 
-bool Polynomial::multiplyInPlace(const Polynomial& other) {
-    if (terms_.size() != 1 || other.terms_.size() != 1 || !isOrdered() || !other.isOrdered()) return false;
+bool Polynomial::isOlderThan(const Polynomial& younger) const {
+    if (terms_.size() != 1 || younger.terms_.size() != 1 || isNegated_ || younger.isNegated_) return false;
+    const auto own = factors(terms_[0]);
+    const auto added = younger.factors(younger.terms_[0]);
+    return own.empty() || added.empty() || own.back().atom < added.front().atom;
+}
+
+bool Polynomial::multiplyAtEnd(const Polynomial& younger) {
     Term& own = terms_[0];
-    const auto added = other.factors(other.terms_[0]);
-    if (own.firstFactor != 0 || own.numFactors != factors_.size()) return false;
-    if (!factors_.empty() && !added.empty() && factors_.back().atom >= added.front().atom) return false;
-    if (own.coefficient.numBits() + other.terms_[0].coefficient.numBits() > limits::coefficientBits) return false;
-    own.coefficient *= other.terms_[0].coefficient;
+    const Term& other = younger.terms_[0];
+    if (own.coefficient.numBits() + other.coefficient.numBits() > limits::coefficientBits) return false;
+    const auto added = younger.factors(other);
+    own.coefficient *= other.coefficient;
+    if (own.firstFactor + own.numFactors != factors_.size()) factors_.resize(own.firstFactor + own.numFactors);
     factors_.insert(factors_.end(), added.begin(), added.end());
-    own.numFactors = static_cast<std::uint32_t>(factors_.size());
-    if (__builtin_add_overflow(own.degree, other.terms_[0].degree, &own.degree))
+    own.numFactors += other.numFactors;
+    if (__builtin_add_overflow(own.degree, other.degree, &own.degree))
         own.degree = std::numeric_limits<std::uint64_t>::max();
     return true;
 }

@@ -19,7 +19,7 @@ namespace QL {
 /// Bounds beyond which a product is not expanded and a divisor is not looked for.
 namespace limits {
 /// Words (terms, factors and limbs of coefficients) of a product of sums before like terms meet.
-inline constexpr std::size_t productWords = 1u << 15;
+inline constexpr std::size_t productWords = 1u << 14;
 inline constexpr std::size_t coefficientBits = 1u << 16;
 /// The largest exponent: every exponent is a double value exactly.
 inline constexpr std::uint64_t exponent = std::uint64_t{1} << 53;
@@ -89,9 +89,11 @@ class Polynomial {
     static std::optional<Polynomial> product(const Polynomial& a, const Polynomial& b);
     /// The power, or nothing when it is beyond the limits.
     static std::optional<Polynomial> power(const Polynomial& base, std::uint64_t exponent);
-    /// Multiplies by one term whose atoms are all younger than those here; for the one-term polynomials of products
-    /// that are written in order. False, with nothing done, when it is not that easy.
-    bool multiplyInPlace(const Polynomial& other);
+    /// Whether both are single terms in order and every atom of this one is older than every atom of `younger`.
+    bool isOlderThan(const Polynomial& younger) const;
+    /// Multiplies by a term that this one isOlderThan, in time for that term alone. False, with nothing done, when the
+    /// product is beyond the limits.
+    bool multiplyAtEnd(const Polynomial& younger);
 
     /// Divides both by their greatest common divisor and returns it, with a positive leading sign. Beyond the limits
     /// the divisor is common but need not be the greatest. None is 0.

@@ -13,29 +13,44 @@ bool fitsIntValue(double whole) {
     return whole >= std::numeric_limits<int>::min() && whole <= std::numeric_limits<int>::max();
 }
 
-std::shared_ptr<const Polynomial> sharedDenominator(Polynomial p) {
-    return p.isOne() ? nullptr : std::make_shared<const Polynomial>(std::move(p));
-}
-
-const Polynomial& one() {
-    static const Polynomial value{Integer(1)};
-    return value;
-}
-
-const Polynomial& denominatorOf(const Value& v) { return v.denominator ? *v.denominator : one(); }
-
 // A number as the double that it is exactly.
 std::optional<double> exactDouble(const Value& v) {
     if (v.floating) return v.floating;
     const auto above = exactDouble(v.numerator.constant());
-    const auto below = v.denominator ? exactDouble(v.denominator->constant()) : 1.0;
-    if (!above || !below || *below == 0.0) return std::nullopt;
+    const auto below = exactDouble(v.denominator.polynomial().constant());
+    if (!above || !below) return std::nullopt;
     int exponent = 0;
     if (std::frexp(*below, &exponent) != 0.5) return std::nullopt; // no power of two
     return std::ldexp(*above, 1 - exponent);
 }
 
+bool isMonomial(const Polynomial& p) { return p.terms().size() == 1 && p.terms()[0].coefficient.isOne(); }
+
+// Multiplies quotients of single terms when all atoms of the second are younger than those of the first: nothing
+// cancels then, and they go to the end. So a long product costs a step a factor.
+bool multiplyAtEnd(Value& older, const Value& younger) {
+    if (!older.numerator.isOlderThan(younger.numerator)) return false;
+    if (older.denominator.isOne() && younger.denominator.isOne())
+        return older.numerator.multiplyAtEnd(younger.numerator);
+    const Polynomial& below = younger.denominator.polynomial();
+    const Polynomial& own = older.denominator.polynomial();
+    if (!older.isReduced || !younger.isReduced || !isMonomial(below) || !isMonomial(own) || !own.isOlderThan(below) ||
+        !own.isOlderThan(younger.numerator) || !older.numerator.isOlderThan(below) ||
+        !older.numerator.multiplyAtEnd(younger.numerator))
+        return false;
+    if (older.denominator.isOne())
+        older.denominator = below;
+    else
+        older.denominator.get()->multiplyAtEnd(below); // of coefficients of 1, so within the limits
+    return true;
+}
+
 } // namespace
+
+const Polynomial& Denominator::polynomial() const {
+    static const Polynomial one{Integer(1)};
+    return value_ ? *value_ : one;
+}
 
 Value RationalArithmetic::polynomial(Polynomial p) const {
     Value v;
@@ -76,14 +91,32 @@ void RationalArithmetic::dropFloating(Value& value) const {
 }
 
 void RationalArithmetic::settle(Value& value) const {
-    dropFloating(value);
+    if (value.floating) return;
     value.numerator.normalize();
     if (value.hasDoubles) uniteDoubles(value.numerator);
+    if (value.isReduced) return;
+    value.isReduced = true;
+    if (value.numerator.isZero()) {
+        value.denominator = {};
+        return;
+    }
+    Polynomial below = value.denominator.taken();
+    Polynomial::removeCommonDivisor(value.numerator, below);
+    value.denominator = std::move(below);
+}
+
+void RationalArithmetic::settleAsPolynomials(Value& value) const {
+    dropFloating(value);
+    settle(value);
 }
 
 // Two numbers of which one is a double: C's arithmetic of doubles, but for results beyond their range.
-std::optional<Value> RationalArithmetic::foldDoubles(SymbolicOp op, const Value& a, const Value& b) const {
-    if ((!a.floating && !b.floating) || !a.isNumber() || !b.isNumber()) return std::nullopt;
+std::optional<Value> RationalArithmetic::foldDoubles(SymbolicOp op, Value& a, Value& b) const {
+    if (!a.floating && !b.floating) return std::nullopt;
+    if (a.numerator.numGathered() > 1 || b.numerator.numGathered() > 1) return std::nullopt; // no number at sight
+    settle(a);
+    settle(b);
+    if (!a.isNumber() || !b.isNumber()) return std::nullopt;
     const auto x = exactDouble(a);
     const auto y = exactDouble(b);
     if (!x || !y) return std::nullopt;
@@ -98,12 +131,10 @@ std::optional<Value> RationalArithmetic::foldDoubles(SymbolicOp op, const Value&
     case SymbolicOp::Multiply:
         result = *x * *y;
         break;
-    case SymbolicOp::Divide:
+    default: // Divide
         if (*y == 0.0) return std::nullopt;
         result = *x / *y;
         break;
-    default:
-        return std::nullopt;
     }
     if (!std::isfinite(result) && std::isfinite(*x) && std::isfinite(*y)) return std::nullopt;
     return number(result);
@@ -151,11 +182,13 @@ void RationalArithmetic::uniteDoubles(Polynomial& p) const {
     p = std::move(united);
 }
 
+// A polynomial of one term over an atom that stands for `p`, but for a number in front.
 Polynomial RationalArithmetic::collapsed(const Polynomial& p) {
-    if (p.isConstant() && p.maxBits() <= limits::coefficientBits / 2) return p;
-    Polynomial rest = p;
+    const bool isShort = p.maxBits() <= limits::coefficientBits / 2;
+    if (p.isConstant() && isShort) return p;
     Integer content(p.leadingSign());
-    if (p.maxBits() <= limits::coefficientBits / 2) content = p.leadingSign() < 0 ? -p.content() : p.content();
+    if (isShort) content = p.leadingSign() < 0 ? -p.content() : p.content();
+    Polynomial rest = p;
     rest.divideExactly(content);
     const Factor atom{writer_.write(rest), 1};
     return Polynomial(content, {&atom, 1});
@@ -168,10 +201,31 @@ Polynomial RationalArithmetic::times(const Polynomial& a, const Polynomial& b) {
 
 Polynomial RationalArithmetic::raised(const Polynomial& base, std::uint64_t exponent) {
     if (auto expanded = Polynomial::power(base, exponent)) return *std::move(expanded);
-    const Polynomial whole = collapsed(base);
-    if (auto expanded = Polynomial::power(whole, exponent)) return *std::move(expanded);
+    if (auto expanded = Polynomial::power(collapsed(base), exponent)) return *std::move(expanded);
     const Factor atom{writer_.write(base), exponent}; // a number whose power is too long to be written
     return Polynomial(Integer(1), {&atom, 1});
+}
+
+Value RationalArithmetic::quotient(Polynomial numerator, Polynomial denominator) const {
+    if (denominator.leadingSign() < 0) {
+        numerator.negate();
+        denominator.negate();
+        denominator.normalize();
+    }
+    Value v;
+    v.numerator = std::move(numerator);
+    v.denominator = std::move(denominator);
+    v.isReduced = v.denominator.isOne();
+    settle(v);
+    return v;
+}
+
+Value RationalArithmetic::reducedQuotient(Value dividend, Value divisor) const {
+    settle(dividend);
+    settle(divisor);
+    dividend.denominator = std::move(divisor.numerator);
+    dividend.hasDoubles |= divisor.hasDoubles;
+    return dividend;
 }
 
 Value RationalArithmetic::negate(Value a) const {
@@ -180,34 +234,48 @@ Value RationalArithmetic::negate(Value a) const {
     return a;
 }
 
-Value RationalArithmetic::quotient(Polynomial numerator, Polynomial denominator) const {
-    Value v;
-    if (!numerator.isZero()) {
-        Polynomial::removeCommonDivisor(numerator, denominator);
-        if (denominator.leadingSign() < 0) {
-            numerator.negate();
-            denominator.negate();
-            numerator.normalize();
-            denominator.normalize();
+// Adds `b` where its denominator is at sight a divisor of that of `a`. The sum is gathered over the denominator of `a`
+// and reduced when it is settled, so that a long sum costs a step a term.
+bool RationalArithmetic::gather(Value& a, Value& b, bool subtracts) const {
+    if (a.denominator.polynomial() == b.denominator.polynomial()) {
+        if (a.numerator.numGathered() < b.numerator.numGathered()) {
+            if (subtracts) b.numerator.negate();
+            std::swap(a.numerator, b.numerator);
+            subtracts = false;
         }
-        v.denominator = sharedDenominator(std::move(denominator));
+        a.numerator.add(b.numerator, subtracts);
+        a.isReduced = a.denominator.isOne();
+        return true;
     }
-    v.numerator = std::move(numerator);
-    return v;
-}
-
-Value RationalArithmetic::reduced(Value dividend, Value divisor) const {
-    settle(dividend);
-    settle(divisor);
-    dividend.denominator = sharedDenominator(std::move(divisor.numerator));
-    dividend.hasDoubles |= divisor.hasDoubles;
-    return dividend;
+    Polynomial factor = a.denominator.polynomial(); // what the second numerator is multiplied by
+    if (!b.denominator.isOne()) {
+        if (!a.denominator.isConstant() || !b.denominator.isConstant()) return false;
+        Integer missing = b.denominator.polynomial().constant();
+        Integer times = a.denominator.polynomial().constant();
+        const Integer common = Integer::gcd(missing, times);
+        missing.divideExactly(common);
+        times.divideExactly(common);
+        factor = Polynomial(times);
+        if (!missing.isOne()) {
+            a.numerator.normalize();
+            auto above = Polynomial::product(a.numerator, Polynomial(missing));
+            auto below = Polynomial::product(a.denominator.polynomial(), Polynomial(missing));
+            if (!above || !below) return false;
+            a.numerator = *std::move(above);
+            a.denominator = *std::move(below);
+        }
+        a.isReduced = false;
+    }
+    b.numerator.normalize();
+    const auto added = Polynomial::product(b.numerator, factor);
+    if (added) a.numerator.add(*added, subtracts);
+    return added.has_value();
 }
 
 // The sum over the least common denominator, reduced by what the two denominators have in common alone.
 std::optional<Value> RationalArithmetic::sumOfQuotients(const Value& a, const Value& b, bool subtracts) const {
-    Polynomial restA = denominatorOf(a);
-    Polynomial restB = denominatorOf(b);
+    Polynomial restA = a.denominator.polynomial();
+    Polynomial restB = b.denominator.polynomial();
     Polynomial common = Polynomial::removeCommonDivisor(restA, restB);
     auto sum = Polynomial::product(a.numerator, restB);
     const auto second = Polynomial::product(b.numerator, restA);
@@ -217,77 +285,73 @@ std::optional<Value> RationalArithmetic::sumOfQuotients(const Value& a, const Va
     if (sum->isZero()) return Value();
     Polynomial::removeCommonDivisor(*sum, common);
     const auto partial = Polynomial::product(restA, restB);
-    const auto whole = partial ? Polynomial::product(*partial, common) : std::nullopt;
+    auto whole = partial ? Polynomial::product(*partial, common) : std::nullopt;
     if (!whole) return std::nullopt;
     Value v;
     v.numerator = *std::move(sum);
-    v.denominator = sharedDenominator(*whole);
+    v.denominator = *std::move(whole);
     return v;
 }
+
+// A quotient as an atom, for a sum that is not brought to one denominator.
+Value RationalArithmetic::asTerm(Value v) { return v.isPolynomial() ? v : polynomial(Polynomial(write(v))); }
 
 Value RationalArithmetic::add(Value a, Value b, bool subtracts) {
     if (auto folded = foldDoubles(subtracts ? SymbolicOp::Minus : SymbolicOp::Plus, a, b)) return *std::move(folded);
     dropFloating(a);
     dropFloating(b);
+    if (a.denominator.isOne() && !b.denominator.isOne()) { // the one with a denominator comes first
+        if (subtracts) b.numerator.negate();
+        std::swap(a, b);
+        subtracts = false;
+    }
     const bool hasDoubles = a.hasDoubles || b.hasDoubles;
     const bool hasOpaqueQuotient = a.hasOpaqueQuotient || b.hasOpaqueQuotient;
-    const auto flagged = [&](Value v) {
+    const auto flagged = [&](Value v, bool isOpaque) {
         v.hasDoubles = hasDoubles;
-        v.hasOpaqueQuotient |= hasOpaqueQuotient;
+        v.hasOpaqueQuotient = isOpaque;
         return v;
     };
-    if (a.isPolynomial() && b.isPolynomial()) {
-        if (a.numerator.numGathered() < b.numerator.numGathered()) {
-            if (subtracts) b.numerator.negate();
-            std::swap(a, b);
-            subtracts = false;
-        }
-        a.numerator.add(b.numerator, subtracts);
-        return flagged(std::move(a));
+    // Where quotients have been given up, the next ones are not tried.
+    if (a.isPolynomial() || !hasOpaqueQuotient) {
+        if (gather(a, b, subtracts)) return flagged(std::move(a), hasOpaqueQuotient);
+        settle(a);
+        settle(b);
+        if (auto sum = sumOfQuotients(a, b, subtracts)) return flagged(*std::move(sum), false);
     }
-    settle(a);
-    settle(b);
-    if (!hasOpaqueQuotient)
-        if (auto sum = sumOfQuotients(a, b, subtracts)) return flagged(*std::move(sum));
-    const auto asTerm = [&](Value& v) {
-        if (v.isPolynomial()) return std::move(v);
-        const Factor atom{write(v), 1};
-        Value term = polynomial(Polynomial(Integer(1), {&atom, 1}));
-        term.hasOpaqueQuotient = true;
-        return term;
-    };
-    Value sum = asTerm(a);
-    const Value added = asTerm(b);
-    sum.numerator.add(added.numerator, subtracts);
-    sum.hasOpaqueQuotient = true;
-    return flagged(std::move(sum));
+    Value sum = asTerm(std::move(a));
+    Value added = asTerm(std::move(b));
+    gather(sum, added, subtracts);
+    return flagged(std::move(sum), true);
 }
 
 Value RationalArithmetic::multiply(Value a, Value b) {
     if (auto folded = foldDoubles(SymbolicOp::Multiply, a, b)) return *std::move(folded);
     dropFloating(a);
     dropFloating(b);
-    if (a.isPolynomial() && b.isPolynomial() && a.numerator.multiplyInPlace(b.numerator)) {
-        a.hasDoubles |= b.hasDoubles;
-        return a;
+    const bool hasDoubles = a.hasDoubles || b.hasDoubles;
+    const bool hasOpaqueQuotient = a.hasOpaqueQuotient || b.hasOpaqueQuotient;
+    if (multiplyAtEnd(b, a)) {
+        std::swap(a, b);
+    } else if (!multiplyAtEnd(a, b)) {
+        settle(a);
+        settle(b);
+        if (a.isZero() || b.isZero()) return number(Integer(0));
+        if (!a.denominator.isOne() || !b.denominator.isOne()) {
+            Polynomial belowA = a.denominator.taken();
+            Polynomial belowB = b.denominator.taken();
+            Polynomial::removeCommonDivisor(a.numerator, belowB);
+            Polynomial::removeCommonDivisor(b.numerator, belowA);
+            a.denominator = times(belowA, belowB);
+        }
+        a.numerator = times(a.numerator, b.numerator);
     }
-    settle(a);
-    settle(b);
-    if (a.isZero() || b.isZero()) return number(Integer(0));
-    Value v;
-    if (a.denominator || b.denominator) {
-        Polynomial belowA = denominatorOf(a);
-        Polynomial belowB = denominatorOf(b);
-        Polynomial::removeCommonDivisor(a.numerator, belowB);
-        Polynomial::removeCommonDivisor(b.numerator, belowA);
-        v.denominator = sharedDenominator(times(belowA, belowB));
-    }
-    v.numerator = times(a.numerator, b.numerator);
-    v.hasDoubles = a.hasDoubles || b.hasDoubles;
-    v.hasOpaqueQuotient = a.hasOpaqueQuotient || b.hasOpaqueQuotient;
-    return v;
+    a.hasDoubles = hasDoubles;
+    a.hasOpaqueQuotient = hasOpaqueQuotient;
+    return a;
 }
 
+// An operator that is not carried out: the expression is an atom.
 Value RationalArithmetic::opaque(SymbolicOp op, Value& a, Value& b) {
     const NodeId left = write(a);
     return polynomial(Polynomial(store_.binary(op, left, write(b))));
@@ -295,23 +359,22 @@ Value RationalArithmetic::opaque(SymbolicOp op, Value& a, Value& b) {
 
 Value RationalArithmetic::divide(Value a, Value b) {
     if (auto folded = foldDoubles(SymbolicOp::Divide, a, b)) return *std::move(folded);
-    settle(b);
+    settleAsPolynomials(b);
     if (b.isZero()) return opaque(SymbolicOp::Divide, a, b);
-    Value inverse;
-    inverse.numerator = denominatorOf(b);
+    Polynomial above = b.denominator.taken();
     if (b.numerator.leadingSign() < 0) {
-        inverse.numerator.negate();
-        inverse.numerator.normalize();
+        above.negate();
+        above.normalize();
         b.numerator.negate();
         b.numerator.normalize();
     }
-    inverse.denominator = sharedDenominator(std::move(b.numerator));
-    inverse.hasDoubles = b.hasDoubles;
-    return multiply(std::move(a), std::move(inverse));
+    b.denominator = std::move(b.numerator);
+    b.numerator = std::move(above);
+    return multiply(std::move(a), std::move(b));
 }
 
 Value RationalArithmetic::power(Value base, std::int64_t exponent) {
-    settle(base);
+    settleAsPolynomials(base);
     if (exponent < 0) {
         if (base.isZero()) {
             Value by = number(Integer(exponent));
@@ -319,12 +382,10 @@ Value RationalArithmetic::power(Value base, std::int64_t exponent) {
         }
         return divide(number(Integer(1)), power(std::move(base), -exponent));
     }
-    const auto times = static_cast<std::uint64_t>(exponent);
-    Value v;
-    v.numerator = raised(base.numerator, times);
-    if (base.denominator) v.denominator = sharedDenominator(raised(*base.denominator, times));
-    v.hasDoubles = base.hasDoubles;
-    return v;
+    const auto magnitude = static_cast<std::uint64_t>(exponent);
+    if (!base.denominator.isOne()) base.denominator = raised(*base.denominator.get(), magnitude);
+    base.numerator = raised(base.numerator, magnitude);
+    return base;
 }
 
 NodeId RationalArithmetic::write(Value& value) {
@@ -335,7 +396,7 @@ NodeId RationalArithmetic::write(Value& value) {
 
 bool RationalArithmetic::isInteger(const Value& value) const {
     if (value.floating) return isWhole(*value.floating);
-    if (value.denominator) return false;
+    if (!value.denominator.isOne()) return false;
     for (const auto& t : value.numerator.terms())
         for (const Factor& f : value.numerator.factors(t))
             if (!store_.isInteger(f.atom)) return false;

@@ -1,6 +1,6 @@
 #include "qlplatform/symbolic/Simplifier_internal.h"
 
-#include <cmath>
+#include <algorithm>
 
 #include "qlplatform/symbolic/SymbolicExprSimplify.h"
 
@@ -51,34 +51,72 @@ bool readFactors(const NodeStore& store, NodeId product, std::vector<Factor>& fa
     return true;
 }
 
+// Of the values that are kept from call to call.
+constexpr std::size_t maxRecent = 1024;
+constexpr std::size_t maxRecentTerms = 16;
+// Room that the next walk may find; a larger one is given back.
+constexpr std::size_t maxKeptEntries = 4096;
+
+template <class T> void emptied(std::vector<T>& list) {
+    if (list.capacity() > maxKeptEntries)
+        list = {};
+    else
+        list.clear();
+}
+
 } // namespace
 
 void Simplifier::remember(NodeId id, NodeId form) {
     if (store_.simplified(form) == noNode) store_.setSimplified(form, form);
-    store_.setSimplified(id, store_.simplified(form));
+    if (store_.simplified(id) == noNode) store_.setSimplified(id, store_.simplified(form));
+}
+
+const Value* Simplifier::recent(NodeId id) const {
+    if (recent_.empty()) return nullptr;
+    const Recent& slot = recent_[id & (recent_.size() - 1)];
+    return slot.id == id ? &slot.value : nullptr;
+}
+
+// Keeps a settled value that reading its expression again would give: a small one without an expression among its
+// atoms.
+void Simplifier::keep(NodeId id, const Value& value) {
+    if (value.floating || value.hasDoubles || !isArithmetic(store_.op(id))) return;
+    for (const Polynomial* p : {&value.numerator, value.denominator.get()}) {
+        if (!p) continue;
+        if (p->terms().size() > maxRecentTerms) return;
+        for (const auto& t : p->terms()) {
+            if (t.numFactors > maxRecentTerms) return;
+            for (const Factor& f : p->factors(t))
+                if (isArithmetic(store_.op(f.atom))) return;
+        }
+    }
+    if (recent_.size() < maxRecent && recent_.size() * 8 < store_.size())
+        recent_ = std::vector<Recent>(std::max<std::size_t>(16, recent_.size() * 2));
+    Recent& slot = recent_[id & (recent_.size() - 1)];
+    slot.id = id;
+    slot.value = value;
+}
+
+NodeId Simplifier::writeAndKeep(NodeId id, Value& value) {
+    const NodeId form = arithmetic_.write(value);
+    remember(id, form);
+    keep(form, value);
+    return store_.simplified(id);
 }
 
 NodeId Simplifier::simplify(NodeId root) {
-    NodeId form = appended(root);
-    if (form == noNode) {
-        listEntries(root);
-        for (const std::uint32_t index : order_) {
-            if (isInnerPart(entries_[index])) continue;
-            Value value = evaluate(entries_[index]);
-            std::uint32_t slot = static_cast<std::uint32_t>(values_.size());
-            if (freeValues_.empty()) {
-                values_.push_back(std::move(value));
-            } else {
-                slot = freeValues_.back();
-                freeValues_.pop_back();
-                values_[slot] = std::move(value);
-            }
-            entries_[index].value = slot;
-        }
-        form = arithmetic_.write(values_[entries_[order_.back()].value]);
+    if (store_.simplified(root) != noNode) return store_.simplified(root);
+    if (const NodeId form = appended(root); form != noNode) {
+        remember(root, form);
+        return store_.simplified(root);
     }
-    if (store_.simplified(root) == noNode) remember(root, form);
-    return store_.simplified(root);
+    forgetWalk(); // of a call that ended early
+    listEntries(root);
+    for (const std::uint32_t index : order_)
+        if (!isInnerPart(entries_[index])) entries_[index].value = stored(evaluate(entries_[index]));
+    const NodeId form = writeAndKeep(root, values_[entries_[order_.back()].value]);
+    forgetWalk();
+    return form;
 }
 
 // A sum or product that only grows at its end is the commonest case of all, and costs as much as its last part.
@@ -121,7 +159,14 @@ NodeId Simplifier::appendedFactor(NodeId product, NodeId factor) const {
 
 bool Simplifier::hasWork(NodeId id) const {
     if (store_.numOperands(id) == 0) return false;
-    return isArithmetic(store_.op(id)) || store_.simplified(id) == noNode;
+    return store_.simplified(id) == noNode || (isArithmetic(store_.op(id)) && !recent(id));
+}
+
+void Simplifier::forgetWalk() {
+    emptied(entries_);
+    emptied(order_);
+    emptied(values_);
+    emptied(freeValues_);
 }
 
 void Simplifier::listEntries(NodeId root) {
@@ -166,6 +211,17 @@ Simplifier::Entry& Simplifier::entryOf(NodeId operand) {
     return entries_[index != NodeSlots::none ? index : slots_.get(store_.simplified(operand))];
 }
 
+std::uint32_t Simplifier::stored(Value value) {
+    if (freeValues_.empty()) {
+        values_.push_back(std::move(value));
+        return static_cast<std::uint32_t>(values_.size() - 1);
+    }
+    const std::uint32_t index = freeValues_.back();
+    freeValues_.pop_back();
+    values_[index] = std::move(value);
+    return index;
+}
+
 // The value of an operand; it is handed over at its last use.
 Value Simplifier::take(NodeId operand) {
     Entry& entry = entryOf(operand);
@@ -178,6 +234,7 @@ Value Simplifier::take(NodeId operand) {
 Value Simplifier::evaluate(const Entry& entry) {
     const NodeId id = entry.id;
     if (!entry.isEntered) {
+        if (const Value* kept = recent(id)) return *kept;
         if (store_.simplified(id) == noNode) store_.setSimplified(id, id);
         return arithmetic_.leaf(id);
     }
@@ -210,8 +267,11 @@ Value Simplifier::evaluateOther(NodeId id) {
         result = evaluateLattice(id);
     } else {
         std::vector<Value> operands;
-        for (std::size_t i = 0; i < store_.numOperands(id); ++i)
+        for (std::size_t i = 0; i < store_.numOperands(id); ++i) {
             operands.push_back(take(store_.operand(id, i)));
+            if (store_.simplified(store_.operand(id, i)) == noNode)
+                writeAndKeep(store_.operand(id, i), operands.back());
+        }
         result = laws_.apply(op, operands);
     }
     remember(id, arithmetic_.write(result));
@@ -221,18 +281,19 @@ Value Simplifier::evaluateOther(NodeId id) {
 Value Simplifier::evaluateQuotient(NodeId id) {
     Value left = take(store_.operand(id, 0));
     Value right = take(store_.operand(id, 1));
-    const bool isSimplified = store_.simplified(id) == id;
-    if (isSimplified && left.isPolynomial() && right.isPolynomial() && !right.isZero())
-        return arithmetic_.reduced(std::move(left), std::move(right));
+    if (store_.simplified(id) == id && left.isPolynomial() && right.isPolynomial()) {
+        arithmetic_.settle(right);
+        if (!right.isZero()) return arithmetic_.reducedQuotient(std::move(left), std::move(right));
+    }
     return arithmetic_.divide(std::move(left), std::move(right));
 }
 
 Value Simplifier::evaluatePower(NodeId id) {
     Value base = take(store_.operand(id, 0));
     Value exponent = take(store_.operand(id, 1));
-    const bool foldsDoubles = base.floating && exponent.isNumber();
-    if (!foldsDoubles && exponent.isNumber() && arithmetic_.isInteger(exponent)) {
-        arithmetic_.settle(exponent);
+    arithmetic_.settle(exponent);
+    if (!base.floating && exponent.isNumber() && arithmetic_.isInteger(exponent)) {
+        arithmetic_.settleAsPolynomials(exponent);
         const Integer times = exponent.numerator.constant();
         if (times.numBits() <= 53) return arithmetic_.power(std::move(base), *times.get());
     }
@@ -254,19 +315,24 @@ Value Simplifier::evaluateLattice(NodeId id) {
                 open.push_back(entryOf(operand).id);
             } else {
                 Value value = take(operand);
-                operands.push_back(arithmetic_.write(value));
+                operands.push_back(store_.simplified(operand) == noNode ? writeAndKeep(operand, value)
+                                                                        : store_.simplified(operand));
             }
         }
     }
     return laws_.applyLattice(store_.op(id), std::move(operands));
 }
 
+std::size_t Simplifier::sizeInMemory() const {
+    return slots_.sizeInMemory() + entries_.capacity() * sizeof(Entry) +
+           (order_.capacity() + freeValues_.capacity()) * sizeof(std::uint32_t) + values_.capacity() * sizeof(Value) +
+           recent_.capacity() * sizeof(Recent);
+}
+
 SymbolicExprSimplify::SymbolicExprSimplify(SymbolicExprTable& table, int, bool) : table_(table) {}
 
 unsigned long SymbolicExprSimplify::simplify(unsigned long exprId, unsigned long&) {
-    NodeStore& store = table_.nodes();
-    const NodeId form = store.simplified(nodeIdOf(exprId));
-    return form != noNode ? form : Simplifier(store).simplify(nodeIdOf(exprId));
+    return table_.simplifier().simplify(nodeIdOf(exprId));
 }
 
 } // namespace QL

@@ -1,5 +1,5 @@
-// One simplification: the walk over the expression. Values are in Rational_internal.h, the laws of the operators that
-// are not arithmetic in SimplifyLaws_internal.h.
+// The simplifier of one table: the walk over an expression, and what is kept from one call to the next. Values are in
+// Rational_internal.h, the laws of the operators that are not arithmetic in SimplifyLaws_internal.h.
 #pragma once
 
 #include <vector>
@@ -11,14 +11,16 @@ namespace QL {
 
 class Simplifier {
   public:
-    explicit Simplifier(NodeStore& store)
-        : store_(store), slots_(store.simplifierSlots()), arithmetic_(store), laws_(arithmetic_) {}
+    explicit Simplifier(NodeStore& store) : store_(store), arithmetic_(store), laws_(arithmetic_) {}
 
-    /// The simplified form of a node whose form is not known yet.
     NodeId simplify(NodeId root);
+
+    std::size_t sizeInMemory() const;
 
   private:
     static constexpr std::uint32_t noValue = ~std::uint32_t{0};
+
+    // A node of the walk.
     struct Entry {
         NodeId id;
         std::uint32_t value = noValue; // index in values_
@@ -27,9 +29,18 @@ class Simplifier {
         bool isUsedByLikeOnly = true;  // every user has the same operator
     };
 
+    // The value of a simplified expression that was met lately.
+    struct Recent {
+        NodeId id = noNode;
+        Value value;
+    };
+
     // The form of a node that the walk goes on with: simplified where that is known.
     NodeId known(NodeId id) const { return store_.simplified(id) == noNode ? id : store_.simplified(id); }
     void remember(NodeId id, NodeId form);
+    NodeId writeAndKeep(NodeId id, Value& value);
+    const Value* recent(NodeId id) const;
+    void keep(NodeId id, const Value& value);
 
     NodeId appended(NodeId root) const;
     NodeId appendedTerm(SymbolicOp op, NodeId sum, NodeId term) const;
@@ -39,22 +50,25 @@ class Simplifier {
     void listEntries(NodeId root);
     bool isInnerPart(const Entry& entry) const;
     Entry& entryOf(NodeId operand);
+    std::uint32_t stored(Value value);
     Value take(NodeId operand);
+    void forgetWalk();
 
     Value evaluate(const Entry& entry);
-    Value evaluateOther(NodeId id);
     Value evaluatePower(NodeId id);
     Value evaluateQuotient(NodeId id);
+    Value evaluateOther(NodeId id);
     Value evaluateLattice(NodeId id);
 
     NodeStore& store_;
-    NodeSlots& slots_;
     RationalArithmetic arithmetic_;
     SimplifyLaws laws_;
+    NodeSlots slots_; // of the walk: entries by node
     std::vector<Entry> entries_;
     std::vector<std::uint32_t> order_; // entries, operands before their users
     std::vector<Value> values_;
     std::vector<std::uint32_t> freeValues_;
+    std::vector<Recent> recent_; // by the low bits of the id
 };
 
 } // namespace QL

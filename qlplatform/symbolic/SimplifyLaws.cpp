@@ -11,12 +11,10 @@ namespace {
 double doubleOf(const Value& number) {
     if (number.floating) return *number.floating;
     const double above = fmpz_get_d(number.numerator.constant().get());
-    return number.denominator ? above / fmpz_get_d(number.denominator->constant().get()) : above;
+    return above / fmpz_get_d(number.denominator.polynomial().constant().get());
 }
 
-Integer denominatorOf(const Value& exactNumber) {
-    return exactNumber.denominator ? exactNumber.denominator->constant() : Integer(1);
-}
+Integer denominatorOf(const Value& exactNumber) { return exactNumber.denominator.polynomial().constant(); }
 
 int leadingSign(const Value& a) { return a.numerator.leadingSign(); }
 
@@ -89,6 +87,8 @@ SymbolicOp opposite(SymbolicOp op) {
 } // namespace
 
 Value SimplifyLaws::apply(SymbolicOp op, std::vector<Value>& operands) {
+    for (Value& operand : operands)
+        arithmetic_.settle(operand);
     switch (op) {
     case SymbolicOp::ND:
         return list(operands);
@@ -151,7 +151,7 @@ Value SimplifyLaws::power(Value& base, Value& exponent) {
         const double result = std::pow(doubleOf(base), doubleOf(exponent));
         if (std::isfinite(result)) return arithmetic_.number(result);
     }
-    if (!base.floating && base.numerator.isOne() && !base.denominator) return base;
+    if (!base.floating && base.numerator.isOne() && base.denominator.isOne()) return base;
     return binaryAtom(SymbolicOp::Power, base, exponent);
 }
 
@@ -172,8 +172,8 @@ Value SimplifyLaws::remainderOfNumbers(SymbolicOp op, Value& a, Value& b) {
 Value SimplifyLaws::remainder(SymbolicOp op, Value a, Value b) {
     if (b.isZero()) return binaryAtom(op, a, b);
     if (a.isNumber() && b.isNumber()) return remainderOfNumbers(op, a, b);
-    arithmetic_.settle(a);
-    arithmetic_.settle(b);
+    arithmetic_.settleAsPolynomials(a);
+    arithmetic_.settleAsPolynomials(b);
     if (a.isZero()) return a;
     if (leadingSign(b) < 0) {
         b = arithmetic_.negate(std::move(b));
@@ -183,14 +183,16 @@ Value SimplifyLaws::remainder(SymbolicOp op, Value a, Value b) {
     }
     if (op == SymbolicOp::Modulo && leadingSign(a) < 0)
         return arithmetic_.negate(remainder(op, arithmetic_.negate(std::move(a)), std::move(b)));
-    if (arithmetic_.isInteger(arithmetic_.divide(a, b))) return arithmetic_.number(Integer(0));
+    const bool mayDivide = a.denominator.isOne() || !b.denominator.isOne(); // a denominator does not go away
+    if (mayDivide && arithmetic_.isInteger(arithmetic_.divide(a, b))) return arithmetic_.number(Integer(0));
 
     // A remainder is its own remainder by the same divisor, and by a number that is not smaller.
     const NodeId inner = soleAtom(a);
     if (inner != noNode && store_.op(inner) == op) {
         const NodeId divisor = store_.operand(inner, 1);
         if (divisor == arithmetic_.write(b)) return a;
-        const bool areInts = store_.op(divisor) == SymbolicOp::IntValue && !b.denominator && b.numerator.isConstant();
+        const bool areInts =
+            store_.op(divisor) == SymbolicOp::IntValue && b.denominator.isOne() && b.numerator.isConstant();
         const Integer first = areInts ? Integer(store_.intValue(divisor)) : Integer(0);
         if (first.sign() > 0 && first < b.numerator.constant()) return a;
     }
@@ -210,7 +212,7 @@ Value SimplifyLaws::rounded(SymbolicOp op, Value a) {
 // floor(K + x) is K + floor(x), and floor((5*K + L)/2) is 2*K + floor((K + L)/2), for whole K. Each term gives what
 // its coefficient holds of the denominator, rounded towards zero, when the denominator is a single term.
 Value SimplifyLaws::wholePartsOut(SymbolicOp op, Value a) {
-    const Polynomial below = a.denominator ? *a.denominator : Polynomial(Integer(1));
+    const Polynomial below = a.denominator.polynomial();
     Value whole = arithmetic_.number(Integer(0));
     if (below.terms().size() == 1) {
         const Integer& divisor = below.terms()[0].coefficient;

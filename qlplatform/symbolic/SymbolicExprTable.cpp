@@ -1,11 +1,13 @@
 #include "qlplatform/symbolic/SymbolicExprTable.h"
 
 #include "qlplatform/symbolic/NodeStore_internal.h"
+#include "qlplatform/symbolic/Simplifier_internal.h"
 #include "qlplatform/symbolic/SymbolicExpr.h"
 
 namespace QL {
 
-SymbolicExprTable::SymbolicExprTable(SymbolDomain domain) : nodes_(std::make_unique<NodeStore>(domain)) {}
+SymbolicExprTable::SymbolicExprTable(SymbolDomain domain)
+    : nodes_(std::make_unique<NodeStore>(domain)), simplifier_(std::make_unique<Simplifier>(*nodes_)) {}
 SymbolicExprTable::~SymbolicExprTable() = default;
 
 unsigned long SymbolicExprTable::getNumExprs() const { return nodes_->size(); }
@@ -51,7 +53,7 @@ void SymbolicExprTable::lookup(SymbolicOp op, std::vector<unsigned long>& ids) c
         if (nodes_->op(id) == op) ids.push_back(id);
 }
 
-std::size_t SymbolicExprTable::sizeInMemory() const { return nodes_->sizeInMemory(); }
+std::size_t SymbolicExprTable::sizeInMemory() const { return nodes_->sizeInMemory() + simplifier_->sizeInMemory(); }
 
 SymbolicOp SymbolicExpr::getOp() const { return table_->nodes().op(nodeIdOf(id_)); }
 std::size_t SymbolicExpr::getNumOperands() const { return table_->nodes().numOperands(nodeIdOf(id_)); }

@@ -25,6 +25,7 @@
 namespace QL {
 
 class NodeStore;
+class Simplifier;
 class SymbolicExpr;
 
 /// What a symbol stands for. In a table of integers the simplifier uses that symbols are whole numbers:
@@ -81,11 +82,13 @@ class QL_EXPORT SymbolicExprTable {
     /// Bytes that the table holds on the heap, capacity included, names excluded.
     std::size_t sizeInMemory() const;
 
-    /// The nodes, for the operations of this folder.
+    /// For the operations of this folder.
     NodeStore& nodes() const { return *nodes_; }
+    Simplifier& simplifier() const { return *simplifier_; }
 
   private:
     std::unique_ptr<NodeStore> nodes_;
+    std::unique_ptr<Simplifier> simplifier_;
 };
 
 } // namespace QL

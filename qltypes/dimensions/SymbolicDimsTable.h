@@ -1,0 +1,189 @@
+// The table of the symbolic dimensions of one model.
+//
+// It owns an expression table, makes ids of symbols, numbers and lists of dimensions, answers questions about them and
+// reshapes them. Handles of ids are in SymbolicDims.h.
+//
+//   QLTypeSys::SymbolicDimsTable table;
+//   const int k = QLTypeSys::SymbolicDimsString(table, "K").getId();
+//   const int shape = QLTypeSys::SymbolicDimsND(table, {table.registerSymbolicDims(1), k}).getId();
+//   table.getDisplayString(table.removeLeadingOnes(shape)); // K
+//
+// A table belongs to one thread at a time: even questions fill caches and add expressions. It is a base class: clients
+// override the hooks. Operations without a word on it take any id that isSymbolicDimsIdValid and check nothing.
+#pragma once
+
+#include <iosfwd>
+#include <set>
+#include <string>
+#include <unordered_map>
+#include <utility>
+#include <vector>
+
+#include "qlplatform/Export.h"
+#include "qlplatform/symbolic/SymbolRegistry.h"
+#include "qltypes/dimensions/QLSymbolicDimsConstraints.h"
+#include "qltypes/dimensions/SymbolicDims.h"
+
+namespace QLTypeSys {
+
+class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
+  public:
+    /// A symbolic id, and a diagnostic that is null on success.
+    using DimsRegistration = std::pair<int, qlsvDiagnosticImpl*>;
+
+    SymbolicDimsTable();
+    ~SymbolicDimsTable() override;
+
+    // Hooks.
+
+    /// The block that constraints are stated for in place of `block`. Here it is the block itself.
+    virtual const QLBlock* getOriginalBlock(const QLBlock* block) const;
+
+    /// A new table for a model, or null as here.
+    virtual SymbolicDimsTable* CreateSymbolicDimsTable(QLRootBD* model) const;
+
+    /// Brings the table back to its first state: every id and handle becomes meaningless.
+    virtual void resetToBuiltin();
+
+    /// Registers a token, or an expression, for a block. Here nothing is registered: id 0 and no diagnostic.
+    virtual DimsRegistration registerSymbolicDims(const char* text, const QLBlock* block);
+    virtual DimsRegistration registerSymbolicDimsExpr(const char* text, const QLBlock* block);
+
+    /// Is told of a dimension that is lost; does nothing here. An override may make or extend the diagnostic.
+    virtual void reportLossOfSymbolicDimensions(qlsvDiagnosticImpl*& diagnostic, int id);
+
+    /// Whether lost dimensions are reported; asked once and remembered by lossOfSymbolicDimsDiagEnabled(). Here true.
+    virtual bool isLossOfSymbolicDimsDiagEnabled() const;
+
+    /// Is told of a symbol that parameters refer to; does nothing here.
+    virtual void registerReferencedSymbolInParamTable(int id, const QLBlock* block);
+
+    // Ids and handles.
+
+    /// Number of expressions, of which the first two are INHERIT and NOSYMBOLIC; 0 while there is no expression table.
+    std::size_t getNumSymbolicDimss() const;
+
+    /// Whether the id is one of this table: -1, 0 or above.
+    bool isSymbolicDimsIdValid(int id) const;
+    /// Whether the id is a symbolic dimension of this table: a valid id but -1 and 0.
+    bool isaSymbolicDimension(int id) const;
+    /// True for a valid id. Raises `InvalidDataTypeId` otherwise.
+    bool checkSymbolicDimsId(int id) const;
+
+    SymbolicDims getSymbolicDims(int id) const;
+    /// The handle of an expression id. Unchecked: it must be below getNumSymbolicDimss().
+    SymbolicDims getSymbolicDimsAt(unsigned long exprId) const;
+    /// The expression of an expression id. Unchecked: it must be below getNumSymbolicDimss().
+    QL::SymbolicExpr getSymbolicExpr(unsigned long exprId) const;
+
+    /// The symbolic id of an expression id of this table, and the table counts as one with symbols registered; 0 for
+    /// any other number.
+    int convertExprId2SymbDimsId(unsigned long exprId);
+
+    /// The id of a number, which may be any.
+    int registerSymbolicDims(int value);
+
+    /// Binds a symbol to a number, for eval. Returns the expression id of the symbol.
+    unsigned long registerValue(const std::string& name, double value);
+    unsigned long registerValue(const std::string& name, int value);
+
+    // Values and shape.
+
+    /// The value of each dimension under the numbers bound to its symbols; no number (NaN) for what has none.
+    std::vector<double> eval(int id) const;
+
+    /// Whether the id is the integer 1 or the double 1.0 itself.
+    bool isOne(int id) const;
+    /// Whether it is one, or every dimension evaluates to 1. True for a list of no dimensions.
+    bool resolvesToOne(int id) const;
+
+    /// Whether it has one dimension, or two of which one isOne().
+    bool isVector(int id);
+
+    /// The id of the product of all dimensions, as multiplying them by `*` one by one gives it.
+    int getWidthSymbolicDimsId(int id);
+
+    /// True and the number when the id is an integer value; false and 0 otherwise, also for an expression that would
+    /// simplify to a number.
+    std::pair<bool, int> getValueOf(int id) const;
+    /// Whether it simplifies to an integer value.
+    bool isNumericalDimension(int id) const;
+
+    /// eval() as whole numbers, rounded towards zero. What is below 0 or no number is 0, what is beyond 64 bits the
+    /// largest number.
+    std::vector<unsigned long> getNumericDims(int id) const;
+
+    /// The names of the symbols of a symbolic dimension, in the order of its text, each once; empty for another id.
+    void getSymbolicDimsSymbols(int id, std::vector<std::string>& names) const;
+    /// The texts of the dimensions of a symbolic dimension; empty for another id.
+    void getSymbolicDimensions(int id, std::vector<std::string>& texts) const;
+
+    // Reshaping. The result must have a dimension, and dimensions are no lists (both asserted in debug builds).
+
+    /// Without the dimensions at the end that isOne(), as far as more than `minDims` are left.
+    int removeTrailingOnes(int id, unsigned long minDims);
+    /// Without the dimensions in front that isOne(). If all are, the first one.
+    int removeLeadingOnes(int id);
+    /// With 1 in place of the dimension at `index`; 1 for what has one dimension. Unchecked: `index` must be below the
+    /// number of dimensions.
+    int collapseDimensions(int id, unsigned long index);
+    /// With the dimensions of 1 that the shape `numeric` has and the id lacks. The id itself when it is no symbolic
+    /// dimension or `numeric` has no more dimensions than it. An entry of `numeric` that is neither 1 nor the value of
+    /// the next dimension is left out without a word.
+    int amendSymbolicDims(int id, const std::vector<int>& numeric);
+
+    // Text.
+
+    /// The C-like text. Owned by the table; good until the next call.
+    const char* getDisplayString(int id);
+    /// The text in the host language.
+    std::string getTorvexExpr(int id) const;
+    /// Writes the number of expressions and a line for each.
+    void print(std::ostream& out) const;
+
+    // Header files.
+
+    /// Records the header file that declares the symbol `id`. The first file of an id stays; an invalid id is ignored.
+    void registerHeaderFile(int id, const std::string& file);
+    /// Adds the header files of the symbols of `id` to the set; of an invalid id none.
+    void getHeaderFiles(int id, std::set<std::string>& files) const;
+
+    // Operators in use.
+
+    /// Appends one record for each expression of the operator, oldest first, with its two operands and no blocks.
+    /// Unchecked: the operator must have two operands.
+    void getOperatorConstraints(QL::SymbolicOp op, std::vector<SymbolicDimsCGConstraint>& list) const;
+    void getDivisionConstraints(std::vector<SymbolicDimsCGConstraint>& list) const;
+    void getModuloConstraints(std::vector<SymbolicDimsCGConstraint>& list) const;
+
+    // Import.
+
+    /// Brings a dimension of another table into this one and registers its symbols for `block`. Returns the id here and
+    /// no diagnostic, or what registering a symbol returned with one. What is no symbolic dimension of `other` keeps
+    /// its id.
+    DimsRegistration importSymbolicDims(const SymbolicDimsTable& other, int id, const QLBlock* block);
+
+    /// isLossOfSymbolicDimsDiagEnabled() as it answered the first time since the last reset.
+    bool lossOfSymbolicDimsDiagEnabled() const;
+
+    using QL::SymbolRegistry::registerSymbolicTExpr;
+
+  protected:
+    /// Whether a symbol has entered the table by a registration or an import since the last reset.
+    bool symbolsRegistered() const { return symbolsRegistered_; }
+
+  private:
+    void initialize();
+    std::vector<int> dimensionIds(int id) const;
+    int listOf(const std::vector<int>& dimensions);
+
+    std::vector<std::string> displayStrings_; // by expression id; cut at a reset
+    std::unordered_map<int, std::string> headerFiles_;
+    unsigned long oneIntExprId_ = 0;
+    unsigned long oneDoubleExprId_ = 0;
+    bool symbolsRegistered_ = false;
+    mutable std::vector<std::string> torvexExprs_; // by expression id; cut at a reset
+    mutable int lossOfSymbolicDimsDiag_ = 0;       // 0 off, 1 on, 2 not yet asked
+};
+
+} // namespace QLTypeSys
