@@ -25,6 +25,7 @@ namespace {
 class ConstructorWords {
   public:
     /// Splits at each bracket and comma; empty words at the end are dropped, those between stay.
+    /// kept: brackets only separate, so a missing or doubled one is not noticed.
     explicit ConstructorWords(const std::string& text) : text_(text), lowered_(text) {
         if (text.find('\0') != std::string::npos) raiseInvalid(text);
         for (char& c : lowered_) {

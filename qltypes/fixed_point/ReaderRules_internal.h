@@ -1,6 +1,7 @@
 // What the two text readers share: the store of what was read, integer fields, the normalising rule.
 #pragma once
 
+#include <functional>
 #include <string>
 #include <string_view>
 

@@ -19,7 +19,6 @@ constexpr const char* invalidConstructor = "QuillaneTypes:general:InvalidNumeric
 constexpr double infinity = std::numeric_limits<double>::infinity();
 constexpr double notANumber = std::numeric_limits<double>::quiet_NaN();
 constexpr int minInt = std::numeric_limits<int>::min();
-constexpr int maxInt = std::numeric_limits<int>::max();
 
 void expectReading(const std::string& text, const reference::Reading& expected) {
     SCOPED_TRACE(shown(text));
@@ -196,6 +195,9 @@ TEST(ConstructorString, GutsAppend) {
     EXPECT_EQ(text, "before:1,16,7");
     fxpDataTypeToConstructorString_FixptGuts(text, {FXP_DT_SCALED_DOUBLE, 0, 9, 0, 0, 1.0, 0.0, 0}, PreferNoScaling);
     EXPECT_EQ(text, "before:1,16,70,9,'DataType','ScaledDouble'");
+    text.clear();
+    fxpDataTypeToConstructorString_FixptGuts(text, {FXP_DT_FIXPT, 1, 16, 0, 1, 1.0, 0.0, 0}, scalingRepPrefer(3));
+    EXPECT_EQ(text, "1,16,2,0"); // any other preference is slope and bias
 }
 
 TEST(ConstructorString, RandomRecordsRoundTrip) {

@@ -91,6 +91,14 @@ TEST(IdentifierString, ATextIsReadOnceAndItsRecordStays) {
     EXPECT_EQ(identifierStringToFxpDataType("int29"), identifierStringToFxpDataType("sfix29"));
 }
 
+const fxpDataTypeProp& readWhileLoading = identifierStringToFxpDataType("sfix21_En4_B1");
+const std::string& writtenWhileLoading = fxpDataTypeToIdentifierString(&readWhileLoading);
+
+TEST(IdentifierString, WorksWhileProgramsLoad) {
+    EXPECT_EQ(&identifierStringToFxpDataType("sfix21_En4_B1"), &readWhileLoading);
+    EXPECT_EQ(writtenWhileLoading, "sfix21_En4_B1");
+}
+
 TEST(IdentifierString, AFailureIsNotRemembered) {
     for (int i = 0; i < 3; ++i) {
         EXPECT_RAISES(identifierStringToFxpDataType("sfix16_E0"), invalidIdentifier, "sfix16_E0");
