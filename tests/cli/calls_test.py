@@ -171,6 +171,9 @@ Messages that cannot be expressed
 2 messages read, 1 laid out, 1 refused: 1 with text
 """)
 
+        self.assertBad("qltypes: --only: demo_msgs/Named cannot be expressed: field 'name' is text",
+                       "layout", self.folder / "demo_msgs/msg", "--only", "demo_msgs/Named")
+
     def test_unreadable_inputs(self):
         absent = self.folder / "absent.json"
         self.assertBad(f"{absent}: cannot be read: No such file or directory", "layout", absent)

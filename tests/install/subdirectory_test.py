@@ -22,8 +22,10 @@ def run(*command):
 
 shutil.rmtree(work, ignore_errors=True)
 work.mkdir(parents=True)
-run("cmake", "-G", "Ninja", project, f"-DQLTYPES_SOURCE={source}", f"-DCMAKE_CXX_COMPILER={compiler}",
-    "-DBUILD_SHARED_LIBS=ON", "-DCMAKE_BUILD_TYPE=Debug")
+configure = ("cmake", "-G", "Ninja", project, f"-DQLTYPES_SOURCE={source}", f"-DCMAKE_CXX_COMPILER={compiler}",
+             "-DCMAKE_BUILD_TYPE=Debug")
+run(*configure, "-B", "static")  # what a parent gets that does not say otherwise
+run(*configure, "-DBUILD_SHARED_LIBS=ON")
 
 commands = run("ninja", "-t", "commands", "consumer").splitlines()
 assert any("part.cpp" in command for command in commands), "the client's sources are not part of the build"

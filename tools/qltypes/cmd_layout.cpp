@@ -3,6 +3,8 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <iterator>
+#include <memory>
 
 #include <fmt/format.h>
 
@@ -47,6 +49,13 @@ Description readInputs(const std::vector<std::string>& inputs) {
     return description;
 }
 
+std::string whyAbsent(const Layout& layout, const std::string& name) {
+    for (const Refusal& refusal : layout.refusals) {
+        if (refusal.label == name) return fmt::format("{} cannot be expressed: {}", name, refusal.reason);
+    }
+    return fmt::format("no structure '{}' was laid out", name);
+}
+
 // Keeps the structures of the given names, in that order.
 void select(Layout& layout, const std::vector<std::string>& names) {
     std::vector<StructureLayout> selected;
@@ -54,8 +63,7 @@ void select(Layout& layout, const std::vector<std::string>& names) {
         const auto at = std::find_if(layout.structures.begin(), layout.structures.end(), [&](auto& structure) {
             return structure.label == name || structure.name == name;
         });
-        if (at == layout.structures.end())
-            throw UsageError(fmt::format("--only: no structure '{}' was laid out", name));
+        if (at == layout.structures.end()) throw UsageError(fmt::format("--only: {}", whyAbsent(layout, name)));
         selected.push_back(*at);
     }
     layout.structures = std::move(selected);
