@@ -142,7 +142,8 @@ TEST(TimeSystem, ARangeIsJudgedByItsOrderFirst) {
     for (const DefaultRow& row : defaultRows) {
         SCOPED_TRACE(row.scale);
         TimeSystem system = row.make();
-        const auto [first, last] = system.getRange();
+        const DateTimeStruct first = system.getRange().first;
+        const DateTimeStruct last = system.getRange().second;
         EXPECT_NO_THROW(system.setRange({first, first})); // a single point
         EXPECT_NO_THROW(system.setRange({last, last}));
 

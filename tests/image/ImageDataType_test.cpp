@@ -10,6 +10,7 @@
 #include "qltypes/dynamic_matrix/DynamicMatrixMemoryManager.h"
 #include "qltypes/host/FeatureFlags.h"
 #include "qltypes/types/DataTypeTableUtils.h"
+#include "tests/dynamic_matrix/MatrixFunctions.h"
 #include "tests/support/Raises.h"
 #include "tests/types/ClientTable.h"
 
@@ -210,22 +211,7 @@ TEST(ImageDataType, AMatrixBackedImageBorrowsFromItsStorage) {
     EXPECT_EQ(record->getSize(), static_cast<int>(sizeof(DynamicMatrix)));
     EXPECT_EQ(record->getContainedDataType(), DATA_TYPE_ID_UINT8);
     EXPECT_EQ(record->getContainedDataNumDims(), 3u);
-    EXPECT_EQ(record->getConstructFcn(), DynamicMatrix::constructFcn);
-    EXPECT_EQ(record->getConstructFcnName(), "constructFcn");
-    EXPECT_EQ(record->getDestructFcn(), DynamicMatrix::destructFcn);
-    EXPECT_EQ(record->getDestructFcnName(), "destructFcn");
-    EXPECT_EQ(record->getDeepCopyFcn(), DynamicMatrix::copyFcn);
-    EXPECT_EQ(record->getDeepCopyFcnName(), "copyFcn");
-    EXPECT_EQ(record->getSizeOfFcn(), DynamicMatrix::getSizeFcn);
-    EXPECT_EQ(record->getSizeOfFcnName(), "getSizeFcn");
-    EXPECT_EQ(record->getContainedDataFcn(), DynamicMatrix::getDataFcn);
-    EXPECT_EQ(record->getContainedDataFcnName(), "getDataFcn");
-    EXPECT_EQ(record->getContainedDataDimsFcn(), DynamicMatrix::getDataDimsFcn);
-    EXPECT_EQ(record->getContainedDataDimsFcnName(), "getDataDimsFcn");
-    EXPECT_EQ(record->getUpdateContainedDataDimsFcn(), DynamicMatrix::updateDataDimsFcn);
-    EXPECT_EQ(record->getUpdateContainedDataDimsFcnName(), "updateDataDimsFcn");
-    EXPECT_EQ(record->getDataConstructFcn(), DynamicMatrix::dataConstructFcn);
-    EXPECT_EQ(record->getDataConstructFcnName(), "dataConstructFcn");
+    testsupport::expectMatrixFunctions(*record);
     EXPECT_EQ(record->getUpdateContainedDataDimFcn(), nullptr); // an image is resized as a whole
     EXPECT_EQ(record->getUpdateContainedDataDimFcnName(), "");
 }
