@@ -34,6 +34,23 @@ Inner
 2 structures laid out
 """
 
+OUTER_NODES = """\
+  depth-first  flat    raw  immediate  offset  path
+            0                               0  (the structure)
+            1     0      0          0       0  x
+            2                       1       8  y
+            3                               8  y(0)
+            4     1    1-3                  8  y(0).a
+            5     2    4-5                 32  y(0).b
+            6                              40  y(1)
+            7     3    6-8                 40  y(1).a
+            8     4   9-10                 64  y(1).b
+            9                       2      72  z
+           10     5  11-13                 72  z.a
+           11     6  14-15                 96  z.b
+
+"""
+
 
 def run(*arguments, stdin=""):
     result = subprocess.run([QLTYPES, *map(str, arguments)], input=stdin, capture_output=True, text=True)
@@ -102,6 +119,59 @@ class Calls(unittest.TestCase):
         self.assertEqual(outer, {
             "name": "Outer", "label": "Outer", "size": 104, "padding": 7, "numElements": 3, "numFlatElements": 7,
             "numRawElements": 16, "numDFSElements": 12})
+
+    def test_numberings(self):
+        code, out, complaint = run("layout", OUTER, "--numberings", "--only", "Outer")
+        self.assertEqual((code, complaint), (0, ""))
+        self.assertEqual(out, OUTER_TEXT[:OUTER_TEXT.index("Inner\n  offset")] + OUTER_NODES + "1 structure laid out\n")
+        outer, inner = json.loads(run("layout", OUTER, "--numberings", "--json")[1])["structures"]
+        self.assertEqual([node["path"] for node in inner["nodes"]], ["", "a", "b"])
+        self.assertEqual(len(outer["nodes"]), outer["numDFSElements"])
+        self.assertEqual(outer["nodes"][5], {
+            "path": "y(0).b", "depthFirst": 5, "flat": 2, "raw": {"first": 4, "last": 5}, "immediate": None,
+            "type": "single", "complex": True, "offset": 32, "width": 1,
+            "parent": {"structure": "Inner", "element": 1}})
+
+    def test_node(self):
+        wanted = """\
+Outer
+  node         y(1).b
+  depth-first  8
+  flat         4
+  raw          9-10
+  immediate    none
+  type         complex single
+  offset       64
+  width        1
+  parent       Inner, its element 1
+"""
+        for node in ("8", "y(1).b"):
+            with self.subTest(node=node):
+                self.assertEqual(run("layout", OUTER, "--only", "Outer", "--node", node), (0, wanted, ""))
+        nodes = json.loads(run("layout", OUTER, "--only", "Outer", "--numberings", "--json")[1])["structures"][0]["nodes"]
+        for node in nodes:
+            asked = [str(node["depthFirst"])] + ([node["path"]] if node["path"] else [])
+            for text in asked:
+                with self.subTest(text=text):
+                    _, out, _ = run("layout", OUTER, "--only", "Outer", "--json", "--node", text)
+                    self.assertEqual(json.loads(out), {"structure": "Outer", "node": node})
+
+    def test_unknown_nodes(self):
+        for node in ("y(2)", "y(0).c", "Outer", "", "12", "99999999999999999999", "0x1", "y( 1)"):
+            with self.subTest(node=node):
+                self.assertBad(f"qltypes: --node: Outer has no node '{node}'",
+                               "layout", OUTER, "--only", "Outer", "--node", node)
+        self.assertBad("qltypes: --node: 2 structures were laid out: name one with --only", "layout", OUTER, "--node", "0")
+        self.assertBadCall("layout", OUTER, "--node", "0", "--numberings")
+
+    def test_too_many_nodes(self):
+        path = self.write("wide.json", json.dumps({"types": [
+            {"name": "Cell", "elements": [{"name": "c", "type": "int8"}]},
+            {"name": "Wide", "elements": [{"name": "w", "type": "Cell", "dimensions": [1000, 1000]}]}]}))
+        for asked in (["--numberings"], ["--node", "1"]):
+            with self.subTest(asked=asked):
+                self.assertBad("qltypes: Wide has 2000002 nodes, more than the 1000000 that are numbered",
+                               "layout", path, "--only", "Wide", *asked)
 
     def test_every_property_is_shown(self):
         _, out, _ = run("layout", ROOT / "examples/drive.json")

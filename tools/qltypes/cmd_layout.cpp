@@ -5,6 +5,7 @@
 #include <filesystem>
 #include <iterator>
 #include <memory>
+#include <optional>
 
 #include <fmt/format.h>
 
@@ -14,6 +15,7 @@
 #include "output/LayoutJson.h"
 #include "output/LayoutText.h"
 #include "output/Output.h"
+#include "table/NodeReader.h"
 #include "table/TypeLoader.h"
 
 namespace inspector {
@@ -69,12 +71,28 @@ void select(Layout& layout, const std::vector<std::string>& names) {
     layout.structures = std::move(selected);
 }
 
+const StructureLayout& onlyStructure(const Layout& layout) {
+    if (layout.structures.size() != 1) {
+        throw UsageError(
+            fmt::format("--node: {} structures were laid out: name one with --only", layout.structures.size()));
+    }
+    return layout.structures.front();
+}
+
+long indexOf(const NodeReader& reader, const std::string& node, const std::string& structureLabel) {
+    const std::optional<long> index = reader.find(node);
+    if (!index) throw UsageError(fmt::format("--node: {} has no node '{}'", structureLabel, node));
+    return *index;
+}
+
 } // namespace
 
 void addLayoutCommand(CLI::App& app) {
     struct Options {
         std::vector<std::string> inputs;
         std::vector<std::string> only;
+        std::optional<std::string> node;
+        bool withNumberings = false;
         bool asJson = false;
     };
     const auto options = std::make_shared<Options>();
@@ -85,11 +103,19 @@ void addLayoutCommand(CLI::App& app) {
                      "JSON type descriptions (- is standard input), .msg files, folders of .msg files")
         ->required();
     command->add_option("--only", options->only, "Show only these structures, names divided by commas")->delimiter(',');
+    CLI::Option* const numberings =
+        command->add_flag("--numberings", options->withNumberings,
+                          "Number each node too: depth-first, flat, raw and immediate, with its full path");
+    command
+        ->add_option("--node", options->node,
+                     "Show one node of the one structure: its depth-first number, or its full path such as y(1).b")
+        ->excludes(numberings);
     command->add_flag("--json", options->asJson, "Print JSON with stable keys");
     command->footer(
         "Examples:\n"
         "  qltypes layout types.json\n"
         "  qltypes layout --json types.json | jq '.structures[].size'\n"
+        "  qltypes layout types.json --only Outer --node 'y(1).b'\n"
         "  qltypes layout /usr/share/geometry_msgs/msg --only geometry_msgs/Pose\n"
         "  echo '{\"types\": [{\"name\": \"P\", \"elements\": [{\"name\": \"x\", \"type\": \"double\"}]}]}' |"
         " qltypes layout -");
@@ -100,6 +126,16 @@ void addLayoutCommand(CLI::App& app) {
         loader.load(description);
         Layout layout = loader.layout(description);
         if (!options->only.empty()) select(layout, options->only);
+        if (options->node) {
+            const NodeReader reader(table, loader, onlyStructure(layout).name);
+            const std::string& label = layout.structures.front().label;
+            const NodeLayout node = reader.node(indexOf(reader, *options->node, label));
+            return print(options->asJson ? nodeJson(label, node) : nodeText(label, node, coloursOfOutput()));
+        }
+        if (options->withNumberings) {
+            for (StructureLayout& structure : layout.structures)
+                structure.nodes = NodeReader(table, loader, structure.name).nodes();
+        }
         print(options->asJson ? layoutJson(layout) : layoutText(layout, !options->only.empty(), coloursOfOutput()));
     });
 }

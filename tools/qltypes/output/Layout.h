@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "description/Description.h"
@@ -35,6 +36,21 @@ struct ElementLayout {
     std::optional<Move> move;
 };
 
+/// A node of a structure with its numbers.
+struct NodeLayout {
+    std::string path; ///< from the structure down, "y(1).b"; empty for the structure itself
+    std::int64_t depthFirst = 0;
+    std::optional<std::int64_t> flat;                         ///< of a leaf
+    std::optional<std::pair<std::int64_t, std::int64_t>> raw; ///< of a leaf: its first and last value
+    std::optional<std::int64_t> immediate;                    ///< of a direct child
+    std::string typeName;
+    std::string typeLabel; ///< the type's name for people
+    bool isComplex = false;
+    std::int64_t offset = 0; ///< in bytes, from the start of the structure
+    std::int64_t width = 0;
+    std::optional<std::pair<std::string, std::int64_t>> parent; ///< label of the structure around it, index in that
+};
+
 struct StructureLayout {
     std::string name;
     std::string label;
@@ -44,6 +60,7 @@ struct StructureLayout {
     std::int64_t numRawElements = 0;
     std::int64_t numDFSElements = 0;
     std::vector<ElementLayout> elements;
+    std::vector<NodeLayout> nodes; ///< in depth-first order; empty unless they were asked for
 };
 
 /// A type that is no structure and not built in.

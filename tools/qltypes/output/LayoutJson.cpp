@@ -48,11 +48,35 @@ Json elementJson(const ElementLayout& element) {
     return json;
 }
 
+template <class Item, class Convert> Json arrayOf(const std::vector<Item>& items, Convert convert) {
+    Json json = Json::array();
+    for (const Item& item : items)
+        json.push_back(convert(item));
+    return json;
+}
+
+Json orNull(const std::optional<std::int64_t>& number) { return number ? Json(*number) : Json(nullptr); }
+
+Json toJson(const NodeLayout& node) {
+    Json json = {
+        {"path", node.path},
+        {"depthFirst", node.depthFirst},
+        {"flat", orNull(node.flat)},
+        {"raw", nullptr},
+        {"immediate", orNull(node.immediate)},
+        {"type", node.typeName},
+        {"complex", node.isComplex},
+        {"offset", node.offset},
+        {"width", node.width},
+        {"parent", nullptr},
+    };
+    if (node.raw) json["raw"] = {{"first", node.raw->first}, {"last", node.raw->second}};
+    if (node.parent) json["parent"] = {{"structure", node.parent->first}, {"element", node.parent->second}};
+    return json;
+}
+
 Json structureJson(const StructureLayout& structure) {
-    Json elements = Json::array();
-    for (const ElementLayout& element : structure.elements)
-        elements.push_back(elementJson(element));
-    return {
+    Json json = {
         {"name", structure.name},
         {"label", structure.label},
         {"size", structure.size},
@@ -61,8 +85,10 @@ Json structureJson(const StructureLayout& structure) {
         {"numFlatElements", structure.numFlatElements},
         {"numRawElements", structure.numRawElements},
         {"numDFSElements", structure.numDFSElements},
-        {"elements", std::move(elements)},
+        {"elements", arrayOf(structure.elements, elementJson)},
     };
+    if (!structure.nodes.empty()) json["nodes"] = arrayOf(structure.nodes, toJson);
+    return json;
 }
 
 Json otherTypeJson(const OtherType& type) {
@@ -77,13 +103,6 @@ Json refusalJson(const Refusal& refusal) {
             {"place", toText(refusal.place)}};
 }
 
-template <class Item, class Convert> Json arrayOf(const std::vector<Item>& items, Convert convert) {
-    Json json = Json::array();
-    for (const Item& item : items)
-        json.push_back(convert(item));
-    return json;
-}
-
 } // namespace
 
 std::string layoutJson(const Layout& layout) {
@@ -96,6 +115,11 @@ std::string layoutJson(const Layout& layout) {
           {"numStructures", layout.structures.size()},
           {"numRefused", layout.refusals.size()}}},
     };
+    return json.dump(2) + "\n";
+}
+
+std::string nodeJson(const std::string& structureLabel, const NodeLayout& node) {
+    const Json json = {{"structure", structureLabel}, {"node", toJson(node)}};
     return json.dump(2) + "\n";
 }
 

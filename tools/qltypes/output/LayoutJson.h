@@ -11,4 +11,7 @@ namespace inspector {
 /// are in bytes; what is not given (a unit, a bound) is null.
 std::string layoutJson(const Layout& layout);
 
+/// One JSON document with one node of a structure.
+std::string nodeJson(const std::string& structureLabel, const NodeLayout& node);
+
 } // namespace inspector

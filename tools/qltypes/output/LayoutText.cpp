@@ -29,17 +29,40 @@ std::string notesOf(const ElementLayout& element) {
     return fmt::format("{}", fmt::join(notes, "; "));
 }
 
+std::string number(std::int64_t value) { return std::to_string(value); }
+std::string number(const std::optional<std::int64_t>& value) { return value ? std::to_string(*value) : ""; }
+
+std::string rawText(const NodeLayout& node) {
+    if (!node.raw) return "";
+    const auto [first, last] = *node.raw;
+    return first == last ? number(first) : fmt::format("{}-{}", first, last);
+}
+
+std::string typeText(bool isComplex, const std::string& label) { return (isComplex ? "complex " : "") + label; }
+
+std::string nodesText(const StructureLayout& structure, const Colours& colours) {
+    TextTable table({{"depth-first", Align::Right},
+                     {"flat", Align::Right},
+                     {"raw", Align::Right},
+                     {"immediate", Align::Right},
+                     {"offset", Align::Right},
+                     {"path", Align::Left}});
+    for (const NodeLayout& node : structure.nodes) {
+        table.addRow({number(node.depthFirst), number(node.flat), rawText(node), number(node.immediate),
+                      number(node.offset), node.path.empty() ? "(the structure)" : node.path});
+    }
+    return table.text("  ", colours) + "\n";
+}
+
 std::string structureText(const StructureLayout& structure, const Colours& colours) {
     TextTable table({{"offset", Align::Right},
                      {"size", Align::Right},
                      {"element", Align::Left},
                      {"type", Align::Left},
                      {"notes", Align::Left}});
-    const auto number = [](std::int64_t value) { return std::to_string(value); };
     for (const ElementLayout& element : structure.elements) {
-        const std::string type = (element.isComplex ? "complex " : "") + element.typeLabel;
-        table.addRow(
-            {number(element.offset), number(element.size), nameWithDimensions(element), type, notesOf(element)});
+        table.addRow({number(element.offset), number(element.size), nameWithDimensions(element),
+                      typeText(element.isComplex, element.typeLabel), notesOf(element)});
         if (element.padding == 0) continue;
         const bool isLast = &element == &structure.elements.back();
         table.addRow({number(element.offset + element.size), number(element.padding), "(padding)", "",
@@ -99,9 +122,25 @@ std::string layoutText(const Layout& layout, bool isSelection, const Colours& co
     std::string text;
     if (!isSelection && !layout.otherTypes.empty()) text += otherTypesText(layout.otherTypes, colours);
     for (const StructureLayout& structure : layout.structures)
-        text += structureText(structure, colours);
+        text += structureText(structure, colours) + (structure.nodes.empty() ? "" : nodesText(structure, colours));
     if (!isSelection && !layout.refusals.empty()) text += refusalsText(layout.refusals, colours);
     return text + summaryText(layout);
+}
+
+std::string nodeText(const std::string& structureLabel, const NodeLayout& node, const Colours& colours) {
+    TextTable table({{"node", Align::Left}, {node.path.empty() ? "(the structure)" : node.path, Align::Left}});
+    const auto addRow = [&](const char* property, const std::string& value) {
+        table.addRow({property, value.empty() ? "none" : value});
+    };
+    addRow("depth-first", number(node.depthFirst));
+    addRow("flat", number(node.flat));
+    addRow("raw", rawText(node));
+    addRow("immediate", number(node.immediate));
+    addRow("type", typeText(node.isComplex, node.typeLabel));
+    addRow("offset", number(node.offset));
+    addRow("width", number(node.width));
+    addRow("parent", node.parent ? fmt::format("{}, its element {}", node.parent->first, node.parent->second) : "");
+    return colours.bold(structureLabel) + "\n" + table.text("  ", colours);
 }
 
 } // namespace inspector

@@ -12,4 +12,7 @@ namespace inspector {
 /// the summary.
 std::string layoutText(const Layout& layout, bool isSelection, const Colours& colours);
 
+/// One node of a structure, a line a property.
+std::string nodeText(const std::string& structureLabel, const NodeLayout& node, const Colours& colours);
+
 } // namespace inspector

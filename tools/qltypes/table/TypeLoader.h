@@ -30,6 +30,9 @@ class TypeLoader {
     /// What the table says of the types of a description that was loaded.
     Layout layout(const Description& description) const;
 
+    /// The name for people of a registered type.
+    std::string labelOf(const std::string& name) const;
+
   private:
     int idOf(const TypeReference& reference);
     int registerNumberType(const TypeReference& reference);
@@ -42,7 +45,6 @@ class TypeLoader {
                                 std::int64_t endOfElementBefore) const;
     StructureLayout structureLayout(const TypeDescription& type) const;
     OtherType otherType(const std::string& name, const char* kind) const;
-    std::string labelOf(const std::string& name) const;
 
     QLTypeSys::DataTypeTable& table_;
     std::vector<std::string> numberTypes_; ///< registered because an element or alias names them
