@@ -47,7 +47,7 @@ enum class ParseOperator : int {
     row = 85,                ///< one child, the list; see elements()
     index = 86,              ///< a call or a paren index: what is called or indexed, then the arguments
     braceIndex = 87,         ///< a brace index: what is indexed, then the arguments
-    field = 88,              ///< s.name: s, then an identifier
+    field = 88,              ///< s.x: s, then the name
     dynamicField = 89,       ///< s.(expression): s, then the expression
     add = 90,                ///< binary +
     subtract = 91,           ///< binary -
@@ -58,8 +58,8 @@ enum class ParseOperator : int {
     unaryPlus = 96,          ///< prefix +
     unaryMinus = 97,         ///< prefix -
     logicalNot = 98,         ///< ~
-    functionHandle = 99,     ///< \@name: one child, an identifier, or the fields of a package
-    anonymousFunction = 100, ///< \@(a, b) body: the parameters, which are identifiers, then the body
+    functionHandle = 99,     ///< \@name: one child, the name, or the fields of a package
+    anonymousFunction = 100, ///< \@(a, b) body: the names of the parameters, then the body
 };
 
 /// A terminal's kind, or the sign that an operator was written with.
@@ -74,6 +74,7 @@ enum class ParseToken : int {
     stringText = 46,      ///< "text"
     wholeDimension = 47,  ///< an index that is a colon and no more
     endOfDimension = 48,  ///< end inside an index
+    name = 49, ///< a name of no variable: a field, a function behind \@, a parameter of an anonymous function
 
     parenthesis = 50, ///< (
     bracket = 51,     ///< [

@@ -121,6 +121,14 @@ class Parser {
         return node(code, sign, left.begin, right.end, std::array{left.node, right.node});
     }
 
+    // An identifier that stands for no variable; `what` says what it names.
+    Operand nameOf(std::string_view what) {
+        if (tokens_.code() != ParseToken::identifier) fail("the name of " + std::string(what));
+        Token name = tokens_.take();
+        name.code = ParseToken::name;
+        return terminal(name);
+    }
+
     bool accept(ParseToken code) {
         if (tokens_.code() != code) return false;
         tokens_.take();
@@ -305,16 +313,14 @@ Operand Parser::fieldOf(const Operand& base) {
         const Operand name = grouped();
         return binaryNode(ParseOperator::dynamicField, dot, base, name);
     }
-    if (tokens_.code() != ParseToken::identifier) fail("the name of a field, or '('");
-    const Operand name = terminal(tokens_.take());
+    const Operand name = nameOf("a field, or '('");
     return binaryNode(ParseOperator::field, dot, base, name);
 }
 
 Operand Parser::handle() {
     const Token at = tokens_.take();
     if (tokens_.code() == ParseToken::parenthesis) return anonymousFunction(at);
-    if (tokens_.code() != ParseToken::identifier) fail("the name of a function, or '('");
-    Operand name = terminal(tokens_.take());
+    Operand name = nameOf("a function, or '('");
     while (tokens_.code() == ParseToken::dot)
         name = fieldOf(name);
     return node(ParseOperator::functionHandle, at, at.begin, name.end, {&name.node, 1});
@@ -325,8 +331,7 @@ Operand Parser::anonymousFunction(const Token& at) {
     std::vector<ParseNode*> children;
     if (tokens_.code() != ParseToken::closingParenthesis) {
         do {
-            if (tokens_.code() != ParseToken::identifier) fail("the name of a parameter");
-            children.push_back(terminal(tokens_.take()).node);
+            children.push_back(nameOf("a parameter").node);
         } while (accept(ParseToken::comma));
     }
     if (tokens_.code() != ParseToken::closingParenthesis) failInside("','", ")", "(", opener.begin);

@@ -261,6 +261,36 @@ TEST(Language, SignsTellFormsOfOneOperatorApart) {
     EXPECT_EQ(all.tree->child(0)->child(2)->tokenCode(), ParseToken::endOfDimension);
 }
 
+// Everything that is an identifier by its code may be a variable.
+void addIdentifiers(const Node& node, std::string& names) {
+    if (node.tokenCode() == ParseToken::identifier) names += (names.empty() ? "" : " ") + std::string(node.text());
+    for (std::size_t i = 0; i < node.numChildren(); ++i)
+        addIdentifiers(*node.child(i), names);
+}
+
+TEST(Language, NamesOfNoVariableAreNoIdentifiers) {
+    constexpr struct {
+        const char* text;
+        const char* identifiers;
+    } cases[] = {
+        {"N + f(M)", "N f M"},
+        {"s.x.y(k)", "s k"},
+        {"s.(n)", "s n"},
+        {"@sin", ""},
+        {"@pkg.fcn", ""},
+        {"@(x, y) x + N", "x N"},
+        {"[a; b'] + c{d}", "a b c d"},
+        {"A(end, :)", "A"},
+        {"'a' + \"b\" + 1i", ""},
+    };
+    for (const auto& one : cases) {
+        SCOPED_TRACE(one.text);
+        std::string identifiers;
+        addIdentifiers(*parsed(one.text).tree, identifiers);
+        EXPECT_EQ(identifiers, one.identifiers);
+    }
+}
+
 TEST(Language, MessagesCarryPositionExpectationAndFind) {
     EXPECT_EQ(testsupport::describe(parsed("f(a b)").refusal.get()),
               testsupport::expectedMessage("Quillane:Language:UnexpectedToken", 4,
