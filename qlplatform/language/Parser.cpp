@@ -109,7 +109,6 @@ class Parser {
     Operand fieldOf(const Operand& base);
     Operand handle();
     Operand anonymousFunction(const Token& at);
-
     ParseNode* argument(ParseToken closer);
 
     Operand terminal(const Token& token) { return {builder_.terminal(token), token.begin, token.end}; }
@@ -309,20 +308,18 @@ ParseNode* Parser::argument(ParseToken closer) {
 
 Operand Parser::fieldOf(const Operand& base) {
     const Token dot = tokens_.take();
-    if (tokens_.code() == ParseToken::parenthesis) {
-        const Operand name = grouped();
-        return binaryNode(ParseOperator::dynamicField, dot, base, name);
-    }
-    const Operand name = nameOf("a field, or '('");
-    return binaryNode(ParseOperator::field, dot, base, name);
+    if (tokens_.code() == ParseToken::parenthesis) return binaryNode(ParseOperator::dynamicField, dot, base, grouped());
+    return binaryNode(ParseOperator::field, dot, base, nameOf("a field, or '('"));
 }
 
 Operand Parser::handle() {
     const Token at = tokens_.take();
     if (tokens_.code() == ParseToken::parenthesis) return anonymousFunction(at);
     Operand name = nameOf("a function, or '('");
-    while (tokens_.code() == ParseToken::dot)
-        name = fieldOf(name);
+    while (tokens_.code() == ParseToken::dot) {
+        const Token dot = tokens_.take();
+        name = binaryNode(ParseOperator::field, dot, name, nameOf("a function"));
+    }
     return node(ParseOperator::functionHandle, at, at.begin, name.end, {&name.node, 1});
 }
 
