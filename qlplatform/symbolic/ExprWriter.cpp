@@ -1,5 +1,6 @@
 #include "qlplatform/symbolic/ExprWriter_internal.h"
 
+#include <algorithm>
 #include <cmath>
 #include <limits>
 
@@ -9,6 +10,12 @@ namespace {
 constexpr std::size_t doubleBits = std::numeric_limits<double>::digits;
 // Digits in which numbers beyond the range of a double are written: base 2^900.
 constexpr ulong digitBits = 900;
+
+// Whether a node with this operator is an atom wherever it stands; any other is one only where it was not expanded.
+bool isAtomByItself(SymbolicOp op) {
+    return op != SymbolicOp::UnaryMinus && op != SymbolicOp::Plus && op != SymbolicOp::Minus &&
+           op != SymbolicOp::Multiply && op != SymbolicOp::Divide;
+}
 
 Integer lowBits(const Integer& number, ulong numBits) {
     Integer low;
@@ -76,18 +83,25 @@ NodeId ExprWriter::writePower(NodeId base, std::uint64_t exponent) {
 
 NodeId ExprWriter::writeTerm(const Integer& coefficient, std::span<const Factor> factors) {
     if (factors.empty()) return write(coefficient);
-    NodeId product = coefficient.isOne() || coefficient.isMinusOne() ? noNode : write(coefficient);
-    bool isNegated = coefficient.isMinusOne();
+    const bool hasSums = std::any_of(factors.begin(), factors.end(),
+                                     [&](const Factor& f) { return !isAtomByItself(store_.op(f.atom)); });
+    NodeId product = coefficient.isOne() || (coefficient.isMinusOne() && !hasSums) ? noNode : write(coefficient);
+    bool isNegated = coefficient.isMinusOne() && !hasSums;
+    // A product with a sum that was not multiplied out is marked as simplified, for that is how it is read again.
+    const auto marked = [&](NodeId node) {
+        if (hasSums && store_.simplified(node) == noNode) store_.setSimplified(node, node);
+        return node;
+    };
     const auto multiply = [&](NodeId factor) {
         if (isNegated) factor = store_.unary(SymbolicOp::UnaryMinus, factor);
         isNegated = false;
-        product = product == noNode ? factor : store_.binary(SymbolicOp::Multiply, product, factor);
+        product = product == noNode ? factor : marked(store_.binary(SymbolicOp::Multiply, product, factor));
     };
     const auto multiplyAll = [&](bool doubles) {
         for (const Factor& f : factors) {
             if ((store_.op(f.atom) == SymbolicOp::DoubleValue) != doubles) continue;
             if (f.exponent > maxRepeatedFactor)
-                multiply(writePower(f.atom, f.exponent));
+                multiply(marked(writePower(f.atom, f.exponent)));
             else
                 for (std::uint64_t i = 0; i < f.exponent; ++i)
                     multiply(f.atom);

@@ -119,15 +119,24 @@ NodeId Simplifier::simplify(NodeId root) {
     return form;
 }
 
+// The simplified form of a part that is added, where that is at hand: an expression over operands that are simplified.
+NodeId Simplifier::atHand(NodeId id) {
+    if (store_.simplified(id) != noNode) return store_.simplified(id);
+    for (std::size_t i = 0; i < store_.numOperands(id); ++i) {
+        const NodeId operand = store_.operand(id, i);
+        if (store_.simplified(operand) == noNode && store_.numOperands(operand) != 0) return noNode;
+    }
+    return store_.numOperands(id) == 0 ? id : simplify(id);
+}
+
 // A sum or product that only grows at its end is the commonest case of all, and costs as much as its last part.
-NodeId Simplifier::appended(NodeId root) const {
+NodeId Simplifier::appended(NodeId root) {
     const SymbolicOp op = store_.op(root);
     if (!isSum(op) && op != SymbolicOp::Multiply) return noNode;
     const NodeId left = store_.simplified(store_.operand(root, 0));
-    const NodeId right = store_.simplified(store_.operand(root, 1));
-    if (left == noNode) return noNode;
-    const NodeId added =
-        right == noNode && store_.numOperands(store_.operand(root, 1)) == 0 ? store_.operand(root, 1) : right;
+    if (left == noNode || (isSum(op) ? !isSum(store_.op(left)) : store_.op(left) != SymbolicOp::Multiply))
+        return noNode;
+    const NodeId added = atHand(store_.operand(root, 1));
     if (added == noNode) return noNode;
     return isSum(op) ? appendedTerm(op, left, added) : appendedFactor(left, added);
 }
@@ -231,6 +240,14 @@ Value Simplifier::take(NodeId operand) {
     return std::move(value);
 }
 
+// The value of a factor. A sum inside a product that is simplified has not been multiplied out, and is not now.
+Value Simplifier::takeFactor(NodeId product, NodeId factor) {
+    Value value = take(factor);
+    if (store_.simplified(product) != product || !isSum(store_.op(factor))) return value;
+    arithmetic_.settle(value);
+    return value.isNumber() ? value : arithmetic_.polynomial(Polynomial(factor));
+}
+
 Value Simplifier::evaluate(const Entry& entry) {
     const NodeId id = entry.id;
     if (!entry.isEntered) {
@@ -248,8 +265,8 @@ Value Simplifier::evaluate(const Entry& entry) {
         return arithmetic_.add(std::move(left), take(store_.operand(id, 1)), op == SymbolicOp::Minus);
     }
     case SymbolicOp::Multiply: {
-        Value left = take(store_.operand(id, 0));
-        return arithmetic_.multiply(std::move(left), take(store_.operand(id, 1)));
+        Value left = takeFactor(id, store_.operand(id, 0));
+        return arithmetic_.multiply(std::move(left), takeFactor(id, store_.operand(id, 1)));
     }
     case SymbolicOp::Divide:
         return evaluateQuotient(id);
@@ -289,7 +306,7 @@ Value Simplifier::evaluateQuotient(NodeId id) {
 }
 
 Value Simplifier::evaluatePower(NodeId id) {
-    Value base = take(store_.operand(id, 0));
+    Value base = takeFactor(id, store_.operand(id, 0));
     Value exponent = take(store_.operand(id, 1));
     arithmetic_.settle(exponent);
     if (!base.floating && exponent.isNumber() && arithmetic_.isInteger(exponent)) {

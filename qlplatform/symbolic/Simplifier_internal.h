@@ -42,7 +42,8 @@ class Simplifier {
     const Value* recent(NodeId id) const;
     void keep(NodeId id, const Value& value);
 
-    NodeId appended(NodeId root) const;
+    NodeId atHand(NodeId id);
+    NodeId appended(NodeId root);
     NodeId appendedTerm(SymbolicOp op, NodeId sum, NodeId term) const;
     NodeId appendedFactor(NodeId product, NodeId factor) const;
 
@@ -52,6 +53,7 @@ class Simplifier {
     Entry& entryOf(NodeId operand);
     std::uint32_t stored(Value value);
     Value take(NodeId operand);
+    Value takeFactor(NodeId product, NodeId factor);
     void forgetWalk();
 
     Value evaluate(const Entry& entry);

@@ -135,7 +135,8 @@ E randomExpression(std::mt19937& random, const std::vector<E>& symbols, const Ra
     QL::SymbolicExprTable& table = *symbols[0].table;
     if (kind.maxDepth == 0 || below(8) == 0) {
         if (below(3) != 0) return symbols[below(symbols.size())];
-        const int value = static_cast<int>(below(static_cast<std::size_t>(2 * kind.maxNumber + 1))) - kind.maxNumber;
+        const long span = 2L * kind.maxNumber + 1;
+        const int value = static_cast<int>(static_cast<long>(below(static_cast<std::size_t>(span))) - kind.maxNumber);
         return kind.withDoubles && below(3) == 0 ? number(table, value / 4.0) : number(table, value);
     }
     RandomKind inner = kind;
