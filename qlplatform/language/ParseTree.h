@@ -121,7 +121,7 @@ enum class ParseToken : int {
 
 /// The greatest depth of nesting, and the greatest height of a tree below its goal. A chain a + a + ... grows by one
 /// level an operator; so what visits a tree may recurse on its height.
-inline constexpr int parseTreeDepthLimit = 1000;
+inline constexpr int parseTreeDepthLimit = 500;
 
 template <class Char> class _T_parse_tree_T;
 

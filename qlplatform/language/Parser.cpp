@@ -84,16 +84,17 @@ class Parser {
     // Counts what is open above the current token: each level is a level of recursion here and of the tree later.
     class Nesting {
       public:
-        explicit Nesting(Parser& parser) : depth_(parser.depth_) {
-            if (depth_ == parseTreeDepthLimit) language::raiseNestingTooDeep(parser.tokens_.current().begin);
-            ++depth_;
+        explicit Nesting(Parser& parser, int levels = 1) : depth_(parser.depth_), levels_(levels) {
+            if (levels > parseTreeDepthLimit - depth_) language::raiseNestingTooDeep(parser.tokens_.current().begin);
+            depth_ += levels;
         }
-        ~Nesting() { --depth_; }
+        ~Nesting() { depth_ -= levels_; }
         Nesting(const Nesting&) = delete;
         Nesting& operator=(const Nesting&) = delete;
 
       private:
         int& depth_;
+        int levels_;
     };
 
     Operand expression() { return binary(anything); }
@@ -137,20 +138,25 @@ class Parser {
         while (accept(ParseToken::endOfLine)) {
         }
     }
-    [[noreturn]] void fail(std::string expected) { language::raiseUnexpectedToken(tokens_, std::move(expected)); }
-
-    // "an operator, ',' or ')' for the '(' at byte 3"
-    [[noreturn]] void failInside(std::string others, std::string_view closerText, std::string_view openerText,
-                                 std::size_t opener) {
-        fail(std::move(others) + " or '" + std::string(closerText) + "' for the '" + std::string(openerText) +
-             "' at byte " + std::to_string(opener));
-    }
+    // These take views and stand apart, so that what recurses keeps no room for texts on the stack.
+    [[noreturn]] void fail(std::string_view expected) const;
+    [[noreturn]] void failInside(std::string_view others, std::string_view closerText, std::string_view openerText,
+                                 std::size_t opener) const;
 
     ParseTreeBuilder builder_;
     Tokens tokens_;
     int depth_ = 0;
     int numOpenIndexes_ = 0; // end means something inside an index only
 };
+
+void Parser::fail(std::string_view expected) const { language::raiseUnexpectedToken(tokens_, std::string(expected)); }
+
+// "an operator, ',' or ')' for the '(' at byte 3"
+void Parser::failInside(std::string_view others, std::string_view closerText, std::string_view openerText,
+                        std::size_t opener) const {
+    fail(std::string(others) + " or '" + std::string(closerText) + "' for the '" + std::string(openerText) +
+         "' at byte " + std::to_string(opener));
+}
 
 Operand Parser::binary(int weakest) {
     const Nesting nesting(*this);
@@ -261,6 +267,7 @@ Operand Parser::rows(ParseOperator code, ParseToken closer, std::string_view clo
 
 // One row, up to what ends it. A comma may stand behind its last element.
 Operand Parser::row(std::string_view openerText, std::size_t opener, ParseToken closer, std::string_view closerText) {
+    const Nesting rowAndList(*this, 2);
     std::vector<ParseNode*> elements;
     const auto isAtEnd = [&] {
         const ParseToken code = tokens_.code();

@@ -305,7 +305,7 @@ TEST(Language, MessagesCarryPositionExpectationAndFind) {
     EXPECT_EQ(testsupport::describe(parsed("%{\na").refusal.get()),
               testsupport::expectedMessage("Quillane:Language:UnterminatedComment", 0));
     EXPECT_EQ(testsupport::describe(parsed(repeated("(", 5000)).refusal.get()),
-              testsupport::expectedMessage("Quillane:Language:NestingTooDeep", 1000, 1000));
+              testsupport::expectedMessage("Quillane:Language:NestingTooDeep", 500, 500));
 }
 
 TEST(Language, NestingIsBounded) {
