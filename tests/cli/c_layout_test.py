@@ -1,86 +1,166 @@
-"""The layout of the whole real message set is what the system's C compiler makes of the same structures.
-
-Where nested structures are declared aligned to 8, the C rule and ours agree: then sizeof and every offsetof must be the same.
+"""The C header of a layout: the system's C compiler agrees with every size and offset that it asserts.
 
 usage: c_layout_test.py QLTYPES
 """
 
 import json
 import pathlib
+import random
 import subprocess
 import sys
 import tempfile
 import unittest
 
 QLTYPES = sys.argv[1]
+ROOT = pathlib.Path(__file__).resolve().parents[2]
 PACKAGES = ("std_msgs", "geometry_msgs", "sensor_msgs", "nav_msgs")
 FOLDERS = [f"/usr/share/{package}/msg" for package in PACKAGES]
+SEED = 20240229
 
-C_TYPES = {
-    "double": "double", "single": "float", "boolean": "unsigned char",
-    "int8": "int8_t", "int16": "int16_t", "int32": "int32_t", "int64": "int64_t",
-    "uint8": "uint8_t", "uint16": "uint16_t", "uint32": "uint32_t", "uint64": "uint64_t",
-}
+NUMBERS = ("double", "single", "half", "boolean", "int8", "uint16", "int32", "int64", "uint64", "sfix16_En7", "ufix24_En3",
+           "ufix1", "sfix40_En5", "sfix65_En2", "ufix128", "flts16_En7", "sfix7_S3p2_B2")
+
+
+def run(*arguments, stdin=""):
+    return subprocess.run([QLTYPES, "layout", *arguments], input=stdin, check=True, stdout=subprocess.PIPE, text=True).stdout
 
 
 def layout(*arguments):
-    return json.loads(subprocess.run([QLTYPES, "layout", "--json", *arguments], check=True, stdout=subprocess.PIPE).stdout)
+    return json.loads(run("--json", *arguments))
 
 
-def in_order_of_need(structures):
-    """The structures, each behind those that it contains."""
-    by_name = {structure["name"]: structure for structure in structures}
-    done = {}
-
-    def add(structure):
-        for element in structure["elements"]:
-            if element["type"] in by_name and element["type"] not in done:
-                add(by_name[element["type"]])
-        done[structure["name"]] = structure
-
-    for structure in structures:
-        add(structure)
-    return list(done.values())
+def header(description, *arguments):
+    return run("-", "--format", "c", *arguments, stdin=json.dumps(description))
 
 
-def c_header(structures):
-    lines = ["#include <stddef.h>", "#include <stdint.h>"]
-    for structure in in_order_of_need(structures):
-        name = f"struct {structure['name']}"
-        lines.append(f"{name} {{")
-        for element in structure["elements"]:
-            c_type = C_TYPES.get(element["type"]) or f"struct {element['type']}"
-            dimensions = "".join(f"[{dimension}]" for dimension in element["dimensions"])
-            lines.append(f"    {c_type} {element['name']}{dimensions};")
-        lines.append("} __attribute__((aligned(8)));")
-        lines.append(f'_Static_assert(sizeof({name}) == {structure["size"]}, "size of {name}");')
-        for element in structure["elements"]:
-            lines.append(f'_Static_assert(offsetof({name}, {element["name"]}) == {element["offset"]}, '
-                         f'"offset of {name}.{element["name"]}");')
-    return "\n".join(lines) + "\n"
-
-
-def compile_header(header):
+def compile_c(text, *flags):
     with tempfile.TemporaryDirectory() as folder:
-        path = pathlib.Path(folder) / "layout.c"
-        path.write_text(header)
-        return subprocess.run(["cc", "-std=c11", "-Wall", "-Wextra", "-Werror", "-fsyntax-only", path],
+        (pathlib.Path(folder) / "layout.h").write_text(text)
+        source = pathlib.Path(folder) / "layout.c"
+        source.write_text('#include "layout.h"\n#include "layout.h"\n')
+        return subprocess.run(["cc", "-std=c11", "-Wall", "-Wextra", "-Werror", "-fsyntax-only", *flags, source],
                               capture_output=True, text=True)
 
 
+def random_description(generator):
+    """Client types, aliases and structures of odd sizes, each of what came before."""
+    types = []
+    known = list(NUMBERS)
+    for i in range(generator.randint(2, 12)):
+        name = f"T{i}"
+        kind = generator.choice(("client", "alias", "structure", "structure", "structure"))
+        if kind == "client":
+            types.append({"name": name, "size": generator.randint(1, 41)})
+        elif kind == "alias":
+            types.append({"name": name, "alias": generator.choice(known)})
+        else:
+            types.append({"name": name, "elements": [
+                {"name": f"e{j}", "type": generator.choice(known), "complex": generator.random() < 0.2,
+                 "dimensions": [generator.randint(1, 4) for _ in range(generator.randint(1, 3))]}
+                for j in range(generator.randint(1, 7))]})
+        known.append(name)
+    types.append({"name": "All", "elements": [{"name": f"e{i}", "type": kind} for i, kind in enumerate(known)]})
+    generator.shuffle(types)
+    return {"types": types}
+
+
 class CLayout(unittest.TestCase):
+    maxDiff = None
+
+    def assertCompiles(self, text, *flags):
+        result = compile_c(text, *flags)
+        self.assertEqual((result.returncode, result.stderr), (0, ""), text)
+
+    def assertAssertsAll(self, text, structures):
+        """The header has an assertion for each size and offset that the layout has."""
+        self.assertEqual(text.count("_Static_assert("), sum(1 + len(each["elements"]) for each in structures))
+
     def test_whole_message_set(self):
-        document = layout(*FOLDERS)
-        self.assertGreater(len(document["structures"]), 30)
-        header = c_header(document["structures"])
-        result = compile_header(header)
-        self.assertEqual((result.returncode, result.stderr), (0, ""))
+        structures = layout(*FOLDERS)["structures"]
+        self.assertGreater(len(structures), 30)
+        for options in ([], ["--padding"]):
+            with self.subTest(options=options):
+                text = run(*FOLDERS, "--format", "c", *options)
+                self.assertAssertsAll(text, structures)
+                self.assertCompiles(text)
 
     def test_a_wrong_offset_would_be_found(self):
-        structures = layout(*FOLDERS)["structures"]
-        moved = next(element for structure in structures for element in structure["elements"] if element["moved"])
-        moved["offset"] -= 1
-        self.assertNotEqual(compile_header(c_header(structures)).returncode, 0)
+        text = run(*FOLDERS, "--format", "c")
+        at = text.index(") == ", text.index("offsetof")) + len(") == ")
+        self.assertNotEqual(compile_c(text[:at] + "1" + text[at:]).returncode, 0)
+
+    def test_random_descriptions(self):
+        generator = random.Random(SEED)
+        texts = {"plain": "", "padding": ""}
+        for number in range(40):
+            description = random_description(generator)
+            for name, options in (("plain", []), ("padding", ["--padding"])):
+                text = header(description, *options)
+                self.assertAssertsAll(text, [each for each in description["types"] if "elements" in each])
+                texts[name] += text.replace("struct T", f"struct D{number}_T").replace("struct All", f"struct D{number}_All")
+        for name, text in texts.items():
+            with self.subTest(name=name, seed=SEED):
+                self.assertIn("packed", text)
+                self.assertCompiles(text)
+        with self.subTest(seed=SEED): # -Wpadded is quiet only where all padding is declared
+            self.assertCompiles(texts["padding"], "-Wpadded")
+            self.assertNotEqual(compile_c(texts["plain"], "-Wpadded").returncode, 0)
+
+    def test_header(self):
+        description = {"types": [{"name": "Outer", "elements": [
+            {"name": "a", "type": "int8"}, {"name": "raw", "type": "Blob"}, {"name": "m", "type": "Inner", "dimensions": [2, 3]},
+            {"name": "int", "type": "sfix16_En7", "complex": True}]},
+            {"name": "Blob", "size": 3}, {"name": "Inner", "elements": [{"name": "x", "type": "double"}]}]}
+        text = header(description, "--padding")
+        self.assertCompiles(text)
+        self.assertEqual(text, """\
+#pragma once
+
+#include <stddef.h>
+#include <stdint.h>
+
+/* Inner: 8 bytes */
+struct Inner {
+    double x;
+} __attribute__((aligned(8)));
+_Static_assert(sizeof(struct Inner) == 8, "size of struct Inner");
+_Static_assert(offsetof(struct Inner, x) == 0, "offset of x in struct Inner");
+
+/* Outer: 64 bytes */
+struct Outer {
+    int8_t a;
+    unsigned char padding_at_1[1];
+    unsigned char raw[3];
+    unsigned char padding_at_5[3];
+    struct Inner m[6]; /* 2 by 3 */
+    int16_t x_int[2];
+    unsigned char padding_at_60[4];
+} __attribute__((packed, aligned(8)));
+_Static_assert(sizeof(struct Outer) == 64, "size of struct Outer");
+_Static_assert(offsetof(struct Outer, a) == 0, "offset of a in struct Outer");
+_Static_assert(offsetof(struct Outer, raw) == 2, "offset of raw in struct Outer");
+_Static_assert(offsetof(struct Outer, m) == 8, "offset of m in struct Outer");
+_Static_assert(offsetof(struct Outer, x_int) == 56, "offset of x_int in struct Outer");
+""")
+        text = header(description)
+        self.assertCompiles(text)
+        self.assertIn("unsigned char raw[3] __attribute__((aligned(2)));", text)
+
+    def test_only_brings_what_it_contains(self):
+        text = run(str(ROOT / "examples/drive.json"), "--only", "Drive", "--format", "c")
+        self.assertCompiles(text)
+        self.assertEqual(text.count("struct Phase {"), 1)
+
+    def test_names_that_c_keeps(self):
+        names = ["int", "x_int", "linux", "__LINE__", "_Bool", "NULL", "offsetof", "INT8_MAX", "INT8_C", "int8_t", "_", "auto",
+                 "padding_at_1", "x", "alignas"]
+        description = {"types": [{"name": name, "elements": [{"name": "v", "type": "int8"}]} for name in names if name != "auto"]}
+        description["types"].append({"name": "Names", "elements": [{"name": name, "type": "int8" if i != 1 else "double"}
+                                                                   for i, name in enumerate(names)]})
+        for options in ([], ["--padding"]):
+            for flags in ([], ["-std=gnu11"], ["-std=gnu2x"]):
+                with self.subTest(options=options, flags=flags):
+                    self.assertCompiles(header(description, *options), *flags)
 
     def test_every_message_is_laid_out_or_refused(self):
         document = layout(*FOLDERS)

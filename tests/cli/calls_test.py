@@ -89,7 +89,9 @@ class Calls(unittest.TestCase):
                 self.assertIn(wanted, out)
 
     def test_bad_calls(self):
-        for arguments in ([], ["layuot"], ["layout"], ["layout", "--yaml", OUTER], ["layout", OUTER, "--only"]):
+        for arguments in ([], ["layuot"], ["layout"], ["layout", "--yaml", OUTER], ["layout", OUTER, "--only"],
+                          ["layout", OUTER, "--format", "yaml"], ["layout", OUTER, "--padding"],
+                          ["layout", OUTER, "--format", "c", "--json"], ["layout", OUTER, "--format", "c", "--numberings"]):
             with self.subTest(arguments=arguments):
                 self.assertBadCall(*arguments)
 

@@ -4,14 +4,17 @@
 #include <algorithm>
 #include <filesystem>
 #include <iterator>
+#include <map>
 #include <memory>
 #include <optional>
+#include <set>
 
 #include <fmt/format.h>
 
 #include "description/Files.h"
 #include "description/JsonReader.h"
 #include "description/MsgReader.h"
+#include "output/CHeader.h"
 #include "output/LayoutJson.h"
 #include "output/LayoutText.h"
 #include "output/Output.h"
@@ -71,6 +74,26 @@ void select(Layout& layout, const std::vector<std::string>& names) {
     layout.structures = std::move(selected);
 }
 
+// Puts each structure behind those that it contains, and adds those that the selected ones contain.
+void orderForC(Layout& layout, const Layout& all, const QLTypeSys::DataTypeTable& table) {
+    const auto idOf = [&](const StructureLayout& structure) { return table.getDataTypeId(structure.name.c_str()); };
+    std::map<std::string, const StructureLayout*> byName;
+    for (const StructureLayout& structure : all.structures)
+        byName.emplace(structure.name, &structure);
+    std::set<std::string> names;
+    for (const StructureLayout& structure : layout.structures)
+        names.insert(structure.name);
+    for (std::size_t i = 0; i < layout.structures.size(); ++i) { // grows while it is walked
+        const std::vector<ElementLayout> elements = layout.structures[i].elements;
+        for (const ElementLayout& element : elements) {
+            const bool isNew = element.cType.kind == CType::Kind::Structure && names.insert(element.cType.name).second;
+            if (isNew) layout.structures.push_back(*byName.at(element.cType.name));
+        }
+    }
+    std::sort(layout.structures.begin(), layout.structures.end(),
+              [&](auto& one, auto& other) { return idOf(one) < idOf(other); }); // registered in that order
+}
+
 const StructureLayout& onlyStructure(const Layout& layout) {
     if (layout.structures.size() != 1) {
         throw UsageError(
@@ -92,6 +115,8 @@ void addLayoutCommand(CLI::App& app) {
         std::vector<std::string> inputs;
         std::vector<std::string> only;
         std::optional<std::string> node;
+        std::string format;
+        bool withPadding = false;
         bool withNumberings = false;
         bool asJson = false;
     };
@@ -106,16 +131,26 @@ void addLayoutCommand(CLI::App& app) {
     CLI::Option* const numberings =
         command->add_flag("--numberings", options->withNumberings,
                           "Number each node too: depth-first, flat, raw and immediate, with its full path");
-    command
-        ->add_option("--node", options->node,
-                     "Show one node of the one structure: its depth-first number, or its full path such as y(1).b")
-        ->excludes(numberings);
-    command->add_flag("--json", options->asJson, "Print JSON with stable keys");
+    CLI::Option* const node =
+        command
+            ->add_option("--node", options->node,
+                         "Show one node of the one structure: its depth-first number, or its full path such as y(1).b")
+            ->excludes(numberings);
+    CLI::Option* const json = command->add_flag("--json", options->asJson, "Print JSON with stable keys");
+    CLI::Option* const format =
+        command->add_option("--format", options->format, "c: print a C header that asserts every size and offset")
+            ->check(CLI::IsMember({"c"}))
+            ->excludes(json)
+            ->excludes(node)
+            ->excludes(numberings);
+    command->add_flag("--padding", options->withPadding, "Declare padding as members of the C structures")
+        ->needs(format);
     command->footer(
         "Examples:\n"
         "  qltypes layout types.json\n"
         "  qltypes layout --json types.json | jq '.structures[].size'\n"
         "  qltypes layout types.json --only Outer --node 'y(1).b'\n"
+        "  qltypes layout types.json --format c --padding > types.h\n"
         "  qltypes layout /usr/share/geometry_msgs/msg --only geometry_msgs/Pose\n"
         "  echo '{\"types\": [{\"name\": \"P\", \"elements\": [{\"name\": \"x\", \"type\": \"double\"}]}]}' |"
         " qltypes layout -");
@@ -124,13 +159,18 @@ void addLayoutCommand(CLI::App& app) {
         QLTypeSys::DataTypeTable table;
         TypeLoader loader(table);
         loader.load(description);
-        Layout layout = loader.layout(description);
+        const Layout all = loader.layout(description);
+        Layout layout = all;
         if (!options->only.empty()) select(layout, options->only);
         if (options->node) {
             const NodeReader reader(table, loader, onlyStructure(layout).name);
             const std::string& label = layout.structures.front().label;
-            const NodeLayout node = reader.node(indexOf(reader, *options->node, label));
-            return print(options->asJson ? nodeJson(label, node) : nodeText(label, node, coloursOfOutput()));
+            const NodeLayout found = reader.node(indexOf(reader, *options->node, label));
+            return print(options->asJson ? nodeJson(label, found) : nodeText(label, found, coloursOfOutput()));
+        }
+        if (!options->format.empty()) {
+            orderForC(layout, all, table);
+            return print(cHeader(layout, options->withPadding));
         }
         if (options->withNumberings) {
             for (StructureLayout& structure : layout.structures)

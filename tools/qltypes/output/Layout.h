@@ -19,6 +19,15 @@ struct Move {
     std::string reason; ///< "aligned to 8: not built-in, size 24"
 };
 
+/// What holds one value in C.
+struct CType {
+    enum class Kind { Number, Structure, Bytes };
+    Kind kind = Kind::Bytes;
+    std::string name; ///< of the number's type, of the structure, or of a byte
+    std::int64_t size = 0;
+    std::int64_t alignment = 1; ///< of the C type, in bytes; that of a structure as it is declared here
+};
+
 struct ElementLayout {
     std::string name;
     std::string typeName;
@@ -34,6 +43,7 @@ struct ElementLayout {
     std::int64_t size = 0;    ///< in bytes, all values of the element
     std::int64_t padding = 0; ///< bytes behind it that belong to nobody
     std::optional<Move> move;
+    CType cType;
 };
 
 /// A node of a structure with its numbers.

@@ -16,6 +16,7 @@
 #include "qltypes/structures/StructElement.h"
 #include "qltypes/structures/StructLayout.h"
 #include "qltypes/types/DataTypeTableUtils.h"
+#include "table/CTypes.h"
 
 namespace inspector {
 namespace {
@@ -160,6 +161,7 @@ ElementLayout TypeLoader::elementLayout(const QLTypeSys::ImmediateElementAccess&
     element.offset = view.getOffset(index);
     element.size = view.getComplexWidth(index) * typeSize;
     element.padding = view.getPadding(index);
+    element.cType = cTypeOf(table_, typeId);
     if (element.offset != endOfElementBefore) {
         const bool isBuiltIn = DtCheckForBuiltInDataType(DtGetDataTypeIdAliasedThruTo(&table_, typeId));
         element.move = moveOf(endOfElementBefore, typeSize, isBuiltIn);
