@@ -14,6 +14,11 @@ class UsageError : public std::runtime_error {
     using std::runtime_error::runtime_error;
 };
 
+/// Ends a command with 1 once it has said all: a loss or a difference was found.
+struct DifferenceFound {};
+
 void addLayoutCommand(CLI::App& app);
+void addTypeCommand(CLI::App& app);
+void addConvertCommand(CLI::App& app);
 
 } // namespace inspector

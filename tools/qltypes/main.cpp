@@ -11,6 +11,7 @@
 
 namespace {
 
+constexpr int differenceFound = 1;
 constexpr int badInput = 2;
 
 int complain(const char* text) {
@@ -26,10 +27,14 @@ int main(int argc, char** argv) {
     app.require_subcommand(1);
     app.footer("Help on a subcommand: qltypes layout --help");
     inspector::addLayoutCommand(app);
+    inspector::addTypeCommand(app);
+    inspector::addConvertCommand(app);
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& e) {
         return app.exit(e) == 0 ? 0 : badInput; // help and version are no failures
+    } catch (const inspector::DifferenceFound&) {
+        return differenceFound;
     } catch (const std::bad_alloc&) {
         return complain("qltypes: out of memory");
     } catch (const inspector::UsageError& e) {
