@@ -212,6 +212,32 @@ Phase
 2 structures laid out
 """)
 
+    def test_enumerations(self):
+        path = self.write("gear.json", json.dumps({"types": [
+            {"name": "Gear", "storage": "int8", "members": [{"name": "Reverse", "value": -1}, {"name": "Park", "value": 0}]},
+            {"name": "Mode", "members": [{"name": "Off", "value": 0}]},
+            {"name": "Lever", "elements": [{"name": "gear", "type": "Gear", "dimensions": [3]}, {"name": "mode", "type": "Mode"}]}]}))
+        self.assertEqual(run("layout", path), (0, """\
+Types that are no structures
+  type  size  kind
+  Gear     1  enumeration of int8: Reverse -1, Park 0
+  Mode     4  enumeration of int32: Off 0
+
+Lever
+  offset  size  element    type  notes
+       0     3  gear[3]    Gear
+       3     1  (padding)
+       4     4  mode       Mode  aligned to 4: not built-in, size 4
+  8 bytes, 1 of them padding; elements: 2 immediate, 2 flat, 4 raw, 3 depth-first
+
+1 structure laid out
+""", ""))
+        self.assertEqual(json.loads(run("layout", path, "--json")[1])["types"][0], {
+            "name": "Gear", "kind": "enumeration", "aliasOf": None, "size": 1, "storage": "int8",
+            "members": [{"name": "Reverse", "value": -1}, {"name": "Park", "value": 0}]})
+        header = run("layout", path, "--format", "c")[1]
+        self.assertIn("    int8_t gear[3];\n    int32_t mode;\n", header)
+
     def test_messages(self):
         self.write("demo_msgs/msg/Stamped.msg", "time stamp\nuint8 flag\nint64 count\n")
         self.write("demo_msgs/msg/Named.msg", "Stamped s\nstring name\n")

@@ -64,11 +64,22 @@ struct StructureDescription {
     std::vector<ElementDescription> elements;
 };
 
+struct EnumerationMember {
+    std::string name;
+    std::int32_t value = 0;
+};
+
+/// Names for integers.
+struct EnumerationDescription {
+    std::string storage; ///< the name of an integer type; empty for that of enumerations that ask for none
+    std::vector<EnumerationMember> members;
+};
+
 struct TypeDescription {
     std::string name;  ///< the registered name, an identifier
     std::string label; ///< the name as its input writes it, for people
     Place place;
-    std::variant<AliasDescription, ClientTypeDescription, StructureDescription> kind;
+    std::variant<AliasDescription, ClientTypeDescription, StructureDescription, EnumerationDescription> kind;
 };
 
 enum class RefusalKind { Text, VariableLength, NoFields, UsesRefused };

@@ -84,11 +84,13 @@ class Node {
     }
 
     /// A number without a fraction, however it is written (4, 4.0), from 1 to the largest 32-bit integer.
-    std::int32_t asCount() const {
-        constexpr std::int32_t largest = std::numeric_limits<std::int32_t>::max();
+    std::int32_t asCount() const { return asWhole(1, std::numeric_limits<std::int32_t>::max()); }
+
+    /// A number without a fraction, within the bounds.
+    std::int32_t asWhole(std::int32_t smallest, std::int32_t largest) const {
         const double number = asNumber();
-        if (!(number >= 1.0 && number <= largest) || number != std::floor(number))
-            complain(fmt::format("must be a whole number from 1 to {}, not {}", largest, json_.dump()));
+        if (!(number >= smallest && number <= largest) || number != std::floor(number))
+            complain(fmt::format("must be a whole number from {} to {}, not {}", smallest, largest, json_.dump()));
         return static_cast<std::int32_t>(number);
     }
 
@@ -147,18 +149,62 @@ StructureDescription readStructure(const Node& elements) {
     return structure;
 }
 
+struct StorageRange {
+    std::string_view storage;
+    std::int32_t smallest;
+    std::int32_t largest;
+};
+
+// The values that a storage type holds; whether it may be one is asked of the library when the type is registered.
+StorageRange rangeOf(std::string_view storage) {
+    // clang-format off
+    constexpr StorageRange ranges[] = {
+        {"int8",   -128,   127},
+        {"int16",  -32768, 32767},
+        {"uint8",  0,      255},
+        {"uint16", 0,      65535},
+    };
+    // clang-format on
+    for (const StorageRange& range : ranges) {
+        if (range.storage == storage) return range;
+    }
+    using Limits = std::numeric_limits<std::int32_t>;
+    return {storage, Limits::min(), Limits::max()};
+}
+
+EnumerationDescription readEnumeration(const Node& node) {
+    EnumerationDescription enumeration;
+    if (node.has("storage")) enumeration.storage = node.at("storage").asIdentifier();
+    const StorageRange range = rangeOf(enumeration.storage);
+    const Node members = node.at("members");
+    std::set<std::string> names;
+    const std::size_t numMembers = members.numItems();
+    for (std::size_t i = 0; i < numMembers; ++i) {
+        const Node member = members.item(i);
+        member.asObject({"name", "value"});
+        const std::string& name = member.at("name").asIdentifier();
+        if (!names.insert(name).second)
+            member.at("name").complain(fmt::format("'{}' names an earlier member already", name));
+        enumeration.members.push_back({name, member.at("value").asWhole(range.smallest, range.largest)});
+    }
+    return enumeration;
+}
+
 TypeDescription readType(const Node& node) {
-    node.asObject({"name", "alias", "size", "elements"});
+    node.asObject({"name", "alias", "size", "elements", "members", "storage"});
     TypeDescription type;
     type.name = node.at("name").asIdentifier();
     type.label = type.name;
     type.place = node.place();
-    if (node.has("alias") + node.has("size") + node.has("elements") != 1)
-        node.complain("must have exactly one of the keys 'alias', 'size', 'elements'");
+    if (node.has("alias") + node.has("size") + node.has("elements") + node.has("members") != 1)
+        node.complain("must have exactly one of the keys 'alias', 'size', 'elements', 'members'");
+    if (node.has("storage") && !node.has("members")) node.complain("must have the key 'members' beside 'storage'");
     if (node.has("alias"))
         type.kind = AliasDescription{{node.at("alias").asIdentifier(), node.at("alias").place()}};
     else if (node.has("size"))
         type.kind = ClientTypeDescription{node.at("size").asCount()};
+    else if (node.has("members"))
+        type.kind = readEnumeration(node);
     else
         type.kind = readStructure(node.at("elements"));
     return type;

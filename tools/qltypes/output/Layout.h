@@ -76,9 +76,11 @@ struct StructureLayout {
 /// A type that is no structure and not built in.
 struct OtherType {
     std::string name;
-    std::string kind;   ///< "alias", "number" or "client"
+    std::string kind;   ///< "alias", "number", "client" or "enumeration"
     std::string target; ///< the label of what an alias stands for
     std::int64_t size = 0;
+    std::string storage; ///< of an enumeration: the type that holds its values
+    std::vector<EnumerationMember> members;
 };
 
 struct Layout {

@@ -93,7 +93,15 @@ Json structureJson(const StructureLayout& structure) {
 
 Json otherTypeJson(const OtherType& type) {
     const Json target = type.target.empty() ? Json(nullptr) : Json(type.target);
-    return {{"name", type.name}, {"kind", type.kind}, {"aliasOf", target}, {"size", type.size}};
+    Json json = {{"name", type.name}, {"kind", type.kind},  {"aliasOf", target},
+                 {"size", type.size}, {"storage", nullptr}, {"members", nullptr}};
+    if (!type.members.empty()) {
+        json["storage"] = type.storage;
+        json["members"] = arrayOf(type.members, [](const EnumerationMember& member) {
+            return Json{{"name", member.name}, {"value", member.value}};
+        });
+    }
+    return json;
 }
 
 Json refusalJson(const Refusal& refusal) {

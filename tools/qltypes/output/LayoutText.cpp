@@ -76,11 +76,19 @@ std::string structureText(const StructureLayout& structure, const Colours& colou
                        structure.numDFSElements);
 }
 
+std::string kindText(const OtherType& type) {
+    if (!type.target.empty()) return "alias of " + type.target;
+    if (type.members.empty()) return type.kind;
+    std::vector<std::string> members;
+    for (const EnumerationMember& member : type.members)
+        members.push_back(fmt::format("{} {}", member.name, member.value));
+    return fmt::format("{} of {}: {}", type.kind, type.storage, fmt::join(members, ", "));
+}
+
 std::string otherTypesText(const std::vector<OtherType>& types, const Colours& colours) {
     TextTable table({{"type", Align::Left}, {"size", Align::Right}, {"kind", Align::Left}});
     for (const OtherType& type : types)
-        table.addRow(
-            {type.name, std::to_string(type.size), type.kind == "alias" ? "alias of " + type.target : type.kind});
+        table.addRow({type.name, number(type.size), kindText(type)});
     return fmt::format("{}\n{}\n", colours.bold("Types that are no structures"), table.text("  ", colours));
 }
 

@@ -31,6 +31,7 @@ CType cTypeOf(const QLTypeSys::DataTypeTable& table, int id) {
         break;
     }
     if (DtCheckForBuiltInDataType(resolved)) return integer(size, DtIsSignedIntDtype(&table, resolved));
+    if (DtIsEnumType(&table, resolved)) return cTypeOf(table, DtGetDataTypeStorageId(&table, resolved));
     if (DtIsStructType(&table, resolved)) return {CType::Kind::Structure, DtGetDataTypeName(&table, resolved), size, 8};
     const bool fitsInteger = size == 1 || size == 2 || size == 4 || size == 8;
     if (fitsInteger && DtIsHalfPrecisionType(&table, resolved)) return integer(size, false);

@@ -6,8 +6,8 @@
 
 namespace inspector {
 
-/// Built-in types and numbers of 1, 2, 4 and 8 bytes as numbers, structures as such, and all others as bytes.
-/// Unchecked: `id` must be valid.
+/// Built-in types, enumerations and numbers of 1, 2, 4 and 8 bytes as numbers, structures as such, and all others as
+/// bytes. Unchecked: `id` must be valid.
 CType cTypeOf(const QLTypeSys::DataTypeTable& table, int id);
 
 } // namespace inspector

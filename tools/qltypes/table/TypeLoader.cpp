@@ -2,11 +2,13 @@
 
 #include <algorithm>
 #include <iterator>
+#include <memory>
 #include <stdexcept>
 
 #include <fmt/format.h>
 
 #include "description/Resolver.h"
+#include "qlplatform/classes/DefinedClass.h"
 #include "qlplatform/services/Diagnostics.h"
 #include "qltypes/fixed_point/IdentifierString.h"
 #include "qltypes/fixed_point/TypeNames.h"
@@ -16,6 +18,7 @@
 #include "qltypes/structures/StructElement.h"
 #include "qltypes/structures/StructLayout.h"
 #include "qltypes/types/DataTypeTableUtils.h"
+#include "qltypes/types/ql_enum_utils.h"
 #include "table/CTypes.h"
 
 namespace inspector {
@@ -99,9 +102,27 @@ void TypeLoader::registerType(const TypeDescription& type) {
         int id = DATA_TYPE_ID_INVALID;
         check(DtRegisterDataType(&table_, nullptr, name, sourceOfClients, &id), type.place);
         check(DtSetDataTypeSize(&table_, nullptr, id, client->size), type.place);
+    } else if (const auto* enumeration = std::get_if<EnumerationDescription>(&type.kind)) {
+        registerEnumeration(type, *enumeration);
     } else {
         registerStructure(type, std::get<StructureDescription>(type.kind));
     }
+}
+
+// The class that says what the enumeration is stays out of sight: only the rules are asked of it.
+void TypeLoader::registerEnumeration(const TypeDescription& type, const EnumerationDescription& enumeration) {
+    const std::string& storage = enumeration.storage;
+    const auto definition = std::make_shared<tcos::DefinedClass>(type.name, tcos::ClassKind::enumeration);
+    definition->derivesFrom(storage.empty() ? "Quillane.IntEnumType" : storage);
+    for (const EnumerationMember& member : enumeration.members)
+        definition->addMember(member.name, member.value);
+    check(qlCheckForValidEnumDataType(definition), type.place);
+
+    const int storageId = storage.empty() ? DATA_TYPE_ID_INT32 : table_.getDataTypeId(storage.c_str());
+    const int id =
+        checked(type.place, [&] { return table_.registerDataType(type.name.c_str(), dtSourceEnum, nullptr); });
+    check(DtSetDataTypeStorageId(&table_, nullptr, id, storageId), type.place);
+    check(DtSetDataTypeSize(&table_, nullptr, id, DtGetDataTypeSize(&table_, storageId)), type.place);
 }
 
 void TypeLoader::registerStructure(const TypeDescription& type, const StructureDescription& structure) {
@@ -189,7 +210,11 @@ StructureLayout TypeLoader::structureLayout(const TypeDescription& type) const {
 }
 
 OtherType TypeLoader::otherType(const std::string& name, const char* kind) const {
-    return {name, kind, "", DtGetDataTypeSize(&table_, table_.getDataTypeId(name.c_str()))};
+    OtherType type;
+    type.name = name;
+    type.kind = kind;
+    type.size = DtGetDataTypeSize(&table_, table_.getDataTypeId(name.c_str()));
+    return type;
 }
 
 std::string TypeLoader::labelOf(const std::string& name) const {
@@ -207,6 +232,11 @@ Layout TypeLoader::layout(const Description& description) const {
         } else if (const auto* alias = std::get_if<AliasDescription>(&type.kind)) {
             layout.otherTypes.push_back(otherType(type.name, "alias"));
             layout.otherTypes.back().target = labelOf(alias->target.name);
+        } else if (const auto* enumeration = std::get_if<EnumerationDescription>(&type.kind)) {
+            layout.otherTypes.push_back(otherType(type.name, "enumeration"));
+            const int id = table_.getDataTypeId(type.name.c_str());
+            layout.otherTypes.back().storage = DtGetDataTypeName(&table_, DtGetDataTypeStorageId(&table_, id));
+            layout.otherTypes.back().members = enumeration->members;
         } else {
             layout.otherTypes.push_back(otherType(type.name, "client"));
         }
