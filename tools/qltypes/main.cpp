@@ -29,6 +29,10 @@ int main(int argc, char** argv) {
     inspector::addLayoutCommand(app);
     inspector::addTypeCommand(app);
     inspector::addConvertCommand(app);
+    inspector::addTimeCommand(app);
+    inspector::addTableCommand(app);
+    inspector::addMessagesCommand(app);
+    inspector::addFlagsCommand(app);
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& e) {
