@@ -44,7 +44,11 @@ TEST(RealMessages, AreLaidOutTheSameInEveryOrder) {
     Description description = realMessages();
     ASSERT_GT(description.types.size(), 30u);
     const auto expected = laidOut(description);
-    EXPECT_EQ(expected.size(), description.types.size());
+    const auto isStructure = [](const TypeDescription& type) {
+        return std::holds_alternative<StructureDescription>(type.kind);
+    };
+    const auto numStructures = std::count_if(description.types.begin(), description.types.end(), isStructure);
+    EXPECT_EQ(static_cast<std::ptrdiff_t>(expected.size()), numStructures);
 
     std::reverse(description.types.begin(), description.types.end());
     EXPECT_EQ(laidOut(description), expected);

@@ -64,6 +64,24 @@ struct StructureDescription {
     std::vector<ElementDescription> elements;
 };
 
+/// Texts. The library names the type; the described name is another one for it, here and for the next two.
+struct StringDescription {
+    unsigned long maxLength = 0; ///< in UTF-16 units; 0 where there is no limit
+};
+
+/// A matrix whose dimensions change at run time.
+struct MatrixDescription {
+    TypeReference element;
+    unsigned long rank = 1;
+};
+
+struct ImageDescription {
+    std::string format;
+    bool isRowMajor = false;
+    std::string base;
+    unsigned long numChannels = 0;
+};
+
 struct EnumerationMember {
     std::string name;
     std::int32_t value = 0;
@@ -79,10 +97,12 @@ struct TypeDescription {
     std::string name;  ///< the registered name, an identifier
     std::string label; ///< the name as its input writes it, for people
     Place place;
-    std::variant<AliasDescription, ClientTypeDescription, StructureDescription, EnumerationDescription> kind;
+    std::variant<AliasDescription, ClientTypeDescription, StructureDescription, EnumerationDescription,
+                 StringDescription, MatrixDescription, ImageDescription>
+        kind;
 };
 
-enum class RefusalKind { Text, VariableLength, NoFields, UsesRefused };
+enum class RefusalKind { NoFields, UsesRefused };
 
 /// A message definition that is well-formed but that the type system cannot express.
 struct Refusal {

@@ -1,6 +1,7 @@
 #include "description/JsonReader.h"
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 #include <initializer_list>
 #include <set>
@@ -60,6 +61,8 @@ class Node {
     Node item(std::size_t index) const {
         return {json_[index], place_.file, place_.within + "/" + std::to_string(index)};
     }
+
+    bool isText() const { return json_.is_string(); }
 
     const std::string& asText() const {
         if (!json_.is_string()) complain(wanted("a string"));
@@ -190,14 +193,47 @@ EnumerationDescription readEnumeration(const Node& node) {
     return enumeration;
 }
 
+// One of some words.
+const std::string& readWord(const Node& node, std::initializer_list<std::string_view> words) {
+    const std::string& word = node.asText();
+    if (std::find(words.begin(), words.end(), word) == words.end())
+        node.complain(fmt::format("must be one of {}, not {}", fmt::join(words, ", "), Json(word).dump()));
+    return word;
+}
+
+StringDescription readString(const Node& node) {
+    if (!node.isText()) return {static_cast<unsigned long>(node.asCount())};
+    readWord(node, {"dynamic"});
+    return {0};
+}
+
+ImageDescription readImage(const Node& node) {
+    node.asObject({"format", "layout", "base", "channels"});
+    ImageDescription image;
+    image.format = readWord(node.at("format"),
+                            {"BGRA", "RGB", "RGBA", "Grayscale", "CMYK", "Spectral", "Lab", "HSV", "YUV444", "CFA"});
+    image.isRowMajor = node.at("layout").asSecondOf("column", "row");
+    image.base = readWord(node.at("base"),
+                          {"double", "single", "int8", "uint8", "int16", "uint16", "int32", "uint32", "boolean"});
+    image.numChannels = static_cast<unsigned long>(node.at("channels").asCount());
+    return image;
+}
+
+MatrixDescription readMatrix(const Node& node) {
+    node.asObject({"of", "rank"});
+    const Node element = node.at("of");
+    return {{element.asIdentifier(), element.place()}, static_cast<unsigned long>(node.at("rank").asCount())};
+}
+
 TypeDescription readType(const Node& node) {
-    node.asObject({"name", "alias", "size", "elements", "members", "storage"});
+    node.asObject({"name", "alias", "size", "elements", "members", "storage", "string", "matrix", "image"});
     TypeDescription type;
     type.name = node.at("name").asIdentifier();
     type.label = type.name;
     type.place = node.place();
-    if (node.has("alias") + node.has("size") + node.has("elements") + node.has("members") != 1)
-        node.complain("must have exactly one of the keys 'alias', 'size', 'elements', 'members'");
+    constexpr std::array<const char*, 7> kinds = {"alias", "size", "elements", "members", "string", "matrix", "image"};
+    if (std::count_if(kinds.begin(), kinds.end(), [&](const char* kind) { return node.has(kind); }) != 1)
+        node.complain(fmt::format("must have exactly one of the keys '{}'", fmt::join(kinds, "', '")));
     if (node.has("storage") && !node.has("members")) node.complain("must have the key 'members' beside 'storage'");
     if (node.has("alias"))
         type.kind = AliasDescription{{node.at("alias").asIdentifier(), node.at("alias").place()}};
@@ -205,6 +241,12 @@ TypeDescription readType(const Node& node) {
         type.kind = ClientTypeDescription{node.at("size").asCount()};
     else if (node.has("members"))
         type.kind = readEnumeration(node);
+    else if (node.has("string"))
+        type.kind = readString(node.at("string"));
+    else if (node.has("matrix"))
+        type.kind = readMatrix(node.at("matrix"));
+    else if (node.has("image"))
+        type.kind = readImage(node.at("image"));
     else
         type.kind = readStructure(node.at("elements"));
     return type;

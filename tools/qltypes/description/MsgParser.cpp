@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 #include <charconv>
+#include <optional>
 #include <set>
 
 #include <fmt/format.h>
@@ -12,7 +13,7 @@ namespace {
 
 struct BasicType {
     std::string_view name;
-    std::string_view registeredName; ///< empty for text
+    std::string_view registeredName;
 };
 
 // clang-format off
@@ -32,7 +33,7 @@ constexpr std::array<BasicType, 16> basicTypes = {{
     {"float64",  "double"},
     {"time",     "time"},
     {"duration", "duration"},
-    {"string",   ""},
+    {"string",   "string"},
 }};
 // clang-format on
 
@@ -96,6 +97,9 @@ class LineReader {
     std::size_t position_ = 0;
 };
 
+// The name that the library gives a matrix of one dimension.
+std::string matrixName(const std::string& element) { return fmt::format("dynmat_{}_1d_t", element); }
+
 // Reads the type in front of a field's name.
 void readType(LineReader& line, std::string_view package, MessageField& field) {
     field.element.type.place = line.place();
@@ -108,11 +112,11 @@ void readType(LineReader& line, std::string_view package, MessageField& field) {
     else if (!basic)
         field.message = std::string(package) + "/" + first;
     field.element.type.name = basic ? std::string(basic->registeredName) : registeredMessageName(field.message);
-    if (field.message.empty() && basic->registeredName.empty()) field.refusal = RefusalKind::Text;
 
     if (!line.skip('[')) return;
     if (line.skip(']')) {
-        if (!field.refusal) field.refusal = RefusalKind::VariableLength;
+        field.elementOfMatrix = field.element.type.name;
+        field.element.type.name = matrixName(field.elementOfMatrix);
         return;
     }
     field.element.dimensions = {line.count()};

@@ -5,7 +5,6 @@
 // "[N]" (N elements) or "[]" (any number) behind it. "type NAME=value" is a constant and skipped, "#" begins a comment.
 #pragma once
 
-#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -15,9 +14,9 @@
 namespace inspector {
 
 struct MessageField {
-    ElementDescription element;         ///< its type is named as it is registered
-    std::string message;                ///< "package/Message" where the type is one, else empty
-    std::optional<RefusalKind> refusal; ///< why the field cannot be expressed, where it cannot
+    ElementDescription element;  ///< its type is named as it is registered
+    std::string message;         ///< "package/Message" where the type, or what an array holds, is one
+    std::string elementOfMatrix; ///< of an array of any length: the name of what it holds
 };
 
 /// The fields of a definition in the given package, in order. int64 and uint64 keep their names, which are those of

@@ -1,7 +1,6 @@
 #include "description/MsgReader.h"
 
 #include <algorithm>
-#include <array>
 
 #include <fmt/format.h>
 
@@ -24,39 +23,21 @@ fs::path packageFolderOf(const fs::path& file) {
     return folder.filename() == "msg" ? folder.parent_path() : folder;
 }
 
+const Place basicTypes{"(basic types of message definitions)", ""};
+
 // The structures that the basic types time and duration stand for.
 TypeDescription pairOfIntegers(const std::string& name, const char* integer) {
-    const Place place{"(basic types of message definitions)", ""};
     StructureDescription structure;
     for (const char* part : {"sec", "nsec"}) {
         structure.elements.emplace_back().name = part;
-        structure.elements.back().type = {integer, place};
+        structure.elements.back().type = {integer, basicTypes};
     }
-    return {name, name, place, std::move(structure)};
-}
-
-// Whether an element of a structure of the description, which has nothing but structures, has the type.
-bool isUsed(const Description& description, const char* typeName) {
-    return std::any_of(description.types.begin(), description.types.end(), [&](const TypeDescription& type) {
-        const auto& elements = std::get<StructureDescription>(type.kind).elements;
-        return std::any_of(elements.begin(), elements.end(),
-                           [&](const ElementDescription& element) { return element.type.name == typeName; });
-    });
+    return {name, name, basicTypes, std::move(structure)};
 }
 
 std::string reasonOf(RefusalKind kind, const MessageField& field) {
-    const std::string& name = field.element.name;
-    switch (kind) {
-    case RefusalKind::Text:
-        return fmt::format("field '{}' is text", name);
-    case RefusalKind::VariableLength:
-        return fmt::format("field '{}' is an array of any length", name);
-    case RefusalKind::UsesRefused:
-        return fmt::format("field '{}' is {}, which is refused", name, field.message);
-    case RefusalKind::NoFields:
-        break;
-    }
-    return "it has no fields";
+    if (kind == RefusalKind::NoFields) return "it has no fields";
+    return fmt::format("field '{}' is {}, which is refused", field.element.name, field.message);
 }
 
 } // namespace
@@ -108,7 +89,7 @@ fs::path MsgReader::find(const MessageField& field, const Message& from) const {
                      fmt::format("unknown type '{}': no file {} in {}", field.message, file, folders.front().string()));
 }
 
-// Refuses each message with a field that cannot be expressed, and whatever contains a refused one.
+// Refuses each message without fields, and whatever contains a refused one.
 void MsgReader::refuse() {
     std::vector<std::vector<std::pair<std::size_t, const MessageField*>>> uses(messages_.size());
     std::vector<std::size_t> refused;
@@ -122,7 +103,6 @@ void MsgReader::refuse() {
     for (std::size_t i = 0; i < messages_.size(); ++i) {
         if (messages_[i].fields.empty()) refuseFor(i, RefusalKind::NoFields, nullptr);
         for (const MessageField& field : messages_[i].fields) {
-            if (field.refusal) refuseFor(i, *field.refusal, &field);
             if (!field.message.empty()) uses[indexByLabel_.at(field.message)].emplace_back(i, &field);
         }
     }
@@ -132,14 +112,21 @@ void MsgReader::refuse() {
     }
 }
 
-void MsgReader::describe(Message& message, Description& description) const {
+// Notes the matrices and basic types that are no built-in ones.
+void MsgReader::describe(Message& message, Description& description, Uses& uses) const {
     if (message.refusal) {
         description.refusals.push_back(std::move(*message.refusal));
         return;
     }
     StructureDescription structure;
-    for (MessageField& field : message.fields)
+    for (MessageField& field : message.fields) {
+        const bool isMatrix = !field.elementOfMatrix.empty();
+        uses.types.insert(isMatrix ? field.elementOfMatrix : field.element.type.name);
+        if (isMatrix)
+            uses.matrices.emplace(field.element.type.name,
+                                  TypeReference{field.elementOfMatrix, field.element.type.place});
         structure.elements.push_back(std::move(field.element));
+    }
     description.types.push_back(
         {registeredMessageName(message.label), message.label, Place{message.file.string(), ""}, std::move(structure)});
 }
@@ -157,11 +144,15 @@ Description MsgReader::read() {
     refuse();
 
     Description description;
+    Uses uses;
     description.numMessages = messages_.size();
     for (Message& message : messages_)
-        describe(message, description);
-    if (isUsed(description, "time")) description.types.push_back(pairOfIntegers("time", "uint32"));
-    if (isUsed(description, "duration")) description.types.push_back(pairOfIntegers("duration", "int32"));
+        describe(message, description, uses);
+    if (uses.types.count("time")) description.types.push_back(pairOfIntegers("time", "uint32"));
+    if (uses.types.count("duration")) description.types.push_back(pairOfIntegers("duration", "int32"));
+    if (uses.types.count("string")) description.types.push_back({"string", "string", basicTypes, StringDescription{}});
+    for (const auto& [name, element] : uses.matrices)
+        description.types.push_back({name, name, element.place, MatrixDescription{element, 1}});
     return description;
 }
 

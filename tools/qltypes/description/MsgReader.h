@@ -8,6 +8,7 @@
 #include <filesystem>
 #include <map>
 #include <optional>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -20,7 +21,8 @@ namespace inspector {
 ///
 /// A message that is referred to is looked for among what was added, beside the file that refers to it, in the package
 /// folders beside that file's package, and in /usr/share. Messages become structures; time and duration become
-/// structures of two 32-bit integers. What cannot be expressed is refused, with all messages that contain it.
+/// structures of two 32-bit integers, texts a dynamic string type, and arrays of any length dynamic matrices of one
+/// dimension. A message without fields is refused, with all messages that contain it.
 class MsgReader {
   public:
     /// Adds one file. Throws InputError when another file of the same package and message was added before.
@@ -42,10 +44,15 @@ class MsgReader {
         std::optional<Refusal> refusal;
     };
 
+    struct Uses {
+        std::set<std::string> types;                   ///< names, those of matrix elements included
+        std::map<std::string, TypeReference> matrices; ///< by name, with what they hold
+    };
+
     void add(const std::string& label, const std::filesystem::path& file);
     std::filesystem::path find(const MessageField& field, const Message& from) const;
     void refuse();
-    void describe(Message& message, Description& description) const;
+    void describe(Message& message, Description& description, Uses& uses) const;
 
     std::vector<Message> messages_;
     std::map<std::string, std::size_t> indexByLabel_; ///< of messages_

@@ -14,6 +14,7 @@ using Indices = std::unordered_map<std::string_view, std::size_t>;
 std::vector<const TypeReference*> referencesOf(const TypeDescription& type) {
     std::vector<const TypeReference*> references;
     if (const auto* alias = std::get_if<AliasDescription>(&type.kind)) references.push_back(&alias->target);
+    if (const auto* matrix = std::get_if<MatrixDescription>(&type.kind)) references.push_back(&matrix->element);
     if (const auto* structure = std::get_if<StructureDescription>(&type.kind)) {
         for (const ElementDescription& element : structure->elements)
             references.push_back(&element.type);

@@ -76,7 +76,7 @@ struct StructureLayout {
 /// A type that is no structure and not built in.
 struct OtherType {
     std::string name;
-    std::string kind;   ///< "alias", "number", "client" or "enumeration"
+    std::string kind;   ///< "alias", "number", "client", "enumeration", "string", "matrix" or "image"
     std::string target; ///< the label of what an alias stands for
     std::int64_t size = 0;
     std::string storage; ///< of an enumeration: the type that holds its values

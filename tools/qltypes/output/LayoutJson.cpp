@@ -9,19 +9,7 @@ namespace {
 
 using Json = nlohmann::ordered_json;
 
-const char* keyOf(RefusalKind kind) {
-    switch (kind) {
-    case RefusalKind::Text:
-        return "text";
-    case RefusalKind::VariableLength:
-        return "variable-length";
-    case RefusalKind::NoFields:
-        return "no-fields";
-    case RefusalKind::UsesRefused:
-        break;
-    }
-    return "uses-refused";
-}
+const char* keyOf(RefusalKind kind) { return kind == RefusalKind::NoFields ? "no-fields" : "uses-refused"; }
 
 Json bound(double value) { return std::isfinite(value) ? Json(value) : Json(nullptr); }
 

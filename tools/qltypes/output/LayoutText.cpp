@@ -107,11 +107,9 @@ std::string summaryText(const Layout& layout) {
     std::string text = fmt::format("{} messages read, {} laid out, {} refused", layout.numMessages,
                                    layout.numMessages - layout.refusals.size(), layout.refusals.size());
     // clang-format off
-    constexpr std::array<std::pair<RefusalKind, const char*>, 4> kinds = {{
-        {RefusalKind::Text,           "with text"},
-        {RefusalKind::VariableLength, "with an array of any length"},
-        {RefusalKind::NoFields,       "without fields"},
-        {RefusalKind::UsesRefused,    "containing a refused one"},
+    constexpr std::array<std::pair<RefusalKind, const char*>, 2> kinds = {{
+        {RefusalKind::NoFields,    "without fields"},
+        {RefusalKind::UsesRefused, "containing a refused one"},
     }};
     // clang-format on
     std::vector<std::string> counts;

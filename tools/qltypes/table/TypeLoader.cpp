@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <map>
 #include <memory>
 #include <stdexcept>
 
@@ -12,6 +13,7 @@
 #include "qlplatform/services/Diagnostics.h"
 #include "qltypes/fixed_point/IdentifierString.h"
 #include "qltypes/fixed_point/TypeNames.h"
+#include "qltypes/image/ImageDataType.h"
 #include "qltypes/structures/ElementAccess.h"
 #include "qltypes/structures/StructDataType.h"
 #include "qltypes/structures/StructDataTypeUtils.h"
@@ -52,6 +54,16 @@ int containerSize(const fxpDataTypeProp& prop) {
         if (prop.WordLength <= 8 * size) return size;
     }
     return (prop.WordLength - 1) / 64 * 8 + 8;
+}
+
+SSImageColorFormat formatOf(const std::string& name) {
+    static const std::map<std::string, SSImageColorFormat> formats = {
+        {"BGRA", SSImageColorFormat_BGRA},     {"RGB", SSImageColorFormat_RGB},
+        {"RGBA", SSImageColorFormat_RGBA},     {"Grayscale", SSImageColorFormat_Grayscale},
+        {"CMYK", SSImageColorFormat_CMYK},     {"Spectral", SSImageColorFormat_Spectral},
+        {"Lab", SSImageColorFormat_Lab},       {"HSV", SSImageColorFormat_HSV},
+        {"YUV444", SSImageColorFormat_YUV444}, {"CFA", SSImageColorFormat_CFA}};
+    return formats.at(name);
 }
 
 // Why an element that would begin at `from` begins elsewhere.
@@ -104,9 +116,28 @@ void TypeLoader::registerType(const TypeDescription& type) {
         check(DtSetDataTypeSize(&table_, nullptr, id, client->size), type.place);
     } else if (const auto* enumeration = std::get_if<EnumerationDescription>(&type.kind)) {
         registerEnumeration(type, *enumeration);
+    } else if (const auto* structure = std::get_if<StructureDescription>(&type.kind)) {
+        registerStructure(type, *structure);
     } else {
-        registerStructure(type, std::get<StructureDescription>(type.kind));
+        registerUnderOwnName(type);
     }
+}
+
+// Strings, matrices and images: the library makes the name, and the described one becomes an alias of it.
+void TypeLoader::registerUnderOwnName(const TypeDescription& type) {
+    const int id = checked(type.place, [&] {
+        if (const auto* string = std::get_if<StringDescription>(&type.kind))
+            return table_.registerStringDataType(string->maxLength, nullptr);
+        if (const auto* matrix = std::get_if<MatrixDescription>(&type.kind))
+            return table_.registerDynamicMatrixDataType(idOf(matrix->element), matrix->rank);
+        const auto& image = std::get<ImageDescription>(type.kind);
+        return table_.registerImageDataType(image.numChannels, formatOf(image.format),
+                                            image.isRowMajor ? SSImageDataLayout_RowMajorInterleaved
+                                                             : SSImageDataLayout_ColumnMajorPlanar,
+                                            BuiltInDTypeId(table_.getDataTypeId(image.base.c_str())));
+    });
+    if (type.name == DtGetDataTypeName(&table_, id)) return;
+    checked(type.place, [&] { return table_.registerAliasDataType(type.name.c_str(), sourceOfClients, id, nullptr); });
 }
 
 // The class that says what the enumeration is stays out of sight: only the rules are asked of it.
@@ -237,8 +268,16 @@ Layout TypeLoader::layout(const Description& description) const {
             const int id = table_.getDataTypeId(type.name.c_str());
             layout.otherTypes.back().storage = DtGetDataTypeName(&table_, DtGetDataTypeStorageId(&table_, id));
             layout.otherTypes.back().members = enumeration->members;
-        } else {
+        } else if (std::holds_alternative<ClientTypeDescription>(type.kind)) {
             layout.otherTypes.push_back(otherType(type.name, "client"));
+        } else {
+            const char* const kind = std::holds_alternative<StringDescription>(type.kind)   ? "string"
+                                     : std::holds_alternative<MatrixDescription>(type.kind) ? "matrix"
+                                                                                            : "image";
+            layout.otherTypes.push_back(otherType(type.name, kind));
+            const int id = table_.getDataTypeId(type.name.c_str());
+            const std::string target = DtGetDataTypeName(&table_, DtGetDataTypeIdAliasedThruTo(&table_, id));
+            if (target != type.name) layout.otherTypes.back().target = target;
         }
     }
     layout.refusals = description.refusals;

@@ -37,6 +37,7 @@ class TypeLoader {
     int idOf(const TypeReference& reference);
     int registerNumberType(const TypeReference& reference);
     void registerType(const TypeDescription& type);
+    void registerUnderOwnName(const TypeDescription& type);
     void registerEnumeration(const TypeDescription& type, const EnumerationDescription& enumeration);
     void registerStructure(const TypeDescription& type, const StructureDescription& structure);
     void fillElement(int structureId, long index, const ElementDescription& element);
