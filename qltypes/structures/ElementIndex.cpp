@@ -4,6 +4,8 @@
 #include <atomic>
 #include <cmath>
 
+#include "qltypes/structures/Arithmetic_internal.h"
+#include "qltypes/structures/TypeMemo_internal.h"
 #include "qltypes/types/DataTypeTable.h"
 
 namespace QLTypeSys::structures {
@@ -45,6 +47,26 @@ bool ElementIndex::Nested::operator==(const Nested& other) const {
            numDFS == other.numDFS && numRaw == other.numRaw;
 }
 
+// What an index copies of the type of an element.
+struct ElementIndex::NestedType {
+    StructDataType* structure; // null for a leaf
+    std::shared_ptr<ElementIndex> index;
+    int size = 0;
+    long numDFS = 0;
+    long numRaw = 0;
+
+    NestedType(const DataTypeTable* table, int id) {
+        DataType* const type = table->getDataTypeAliasedThruTo(id);
+        structure =
+            id != DATA_TYPE_ID_AUTO && type->getIsType(dtqStruct) ? static_cast<StructDataType*>(type) : nullptr;
+        if (!structure) return;
+        index = shared(table, id, *structure);
+        size = table->getDataTypeAt(static_cast<unsigned long>(id + 1))->getSize();
+        numDFS = structure->getNumDFSElements();
+        numRaw = structure->getNumRawElements();
+    }
+};
+
 // --- Reading ---------------------------------------------------------------------------------------------------------
 
 ElementIndex::ElementIndex(const DataTypeTable* table, int id, StructDataType& record)
@@ -73,15 +95,17 @@ ElementIndex& ElementIndex::current() {
     Numbering numbering = read();
     if (numbering != numbering_) {
         writeDown(askedElements_);
-        writeDown(offsets_);
-        writeDown(varDimsOffsets_);
+        writeDown(offset_);
+        writeDown(varDimsOffset_);
         for (const Nested& nested : numbering_.nested) // written answers may point to heads that these made
             if (std::find(kept_.begin(), kept_.end(), nested.index) == kept_.end()) kept_.push_back(nested.index);
         numbering_ = std::move(numbering);
+        nodes_.prepare(numImmediate(), [this](long i) { return lastNode(i); });
+        raw_.prepare(numImmediate(), [this](long i) { return rawEnd(i); });
         askedElements_.reset(numbering_.numDFS); // now that it has another number of nodes
         root_ = nullptr;
-        renew(offsets_);
-        renew(varDimsOffsets_);
+        renew(offset_);
+        renew(varDimsOffset_);
     }
     readAt_ = numbering_.isComplete ? now : 0;
     return *this;
@@ -93,49 +117,50 @@ ElementIndex::Numbering ElementIndex::read() const {
     made.size = table_->getDataTypeAt(static_cast<unsigned long>(viewId_ + 1))->getSize();
     made.numDFS = record_->getNumDFSElements();
     made.elements.reserve(elements.size());
-    made.nodes.reserve(elements.size());
     made.raw.reserve(elements.size());
-    made.nestedAt.reserve(elements.size());
+    TypeMemo<NestedType, const DataTypeTable*> types(table_);
+    long lastNode = 0;
+    long raw = 0;
     for (StructElement* element : elements) {
-        const int typeId = element->dataTypeId;
-        if (!table_->isDataTypeIdValid(typeId)) {
+        if (!table_->isDataTypeIdValid(element->dataTypeId)) {
             made.isComplete = false;
             break;
         }
         element->isIndexed_ = true;
-        made.elements.push_back(element);
+        const NestedType& type = types.of(element->dataTypeId);
         const long width = element->getWidth();
-        DataType* const type = table_->getDataTypeAliasedThruTo(typeId);
-        if (typeId == DATA_TYPE_ID_AUTO || !type->getIsType(dtqStruct)) {
-            made.nodes.append(1);
-            made.raw.append(element->signalType == 1 ? wrappingMultiply(width, 2) : width);
-            made.nestedAt.push_back(leaf);
-            continue;
+        std::uint32_t position = leaf;
+        if (!type.structure) {
+            lastNode = wrappingAdd(lastNode, 1);
+            raw = wrappingAdd(raw, element->signalType == 1 ? wrappingMultiply(width, 2) : width);
+        } else {
+            position = static_cast<std::uint32_t>(made.nested.size());
+            made.nested.push_back({type.index, element->dataTypeId, type.size, width, type.numDFS, type.numRaw});
+            lastNode =
+                wrappingAdd(lastNode, width > 1 ? wrappingAdd(wrappingMultiply(width, type.numDFS), 1) : type.numDFS);
+            raw = wrappingAdd(raw, wrappingMultiply(width, type.numRaw));
         }
-        auto& structure = static_cast<StructDataType&>(*type);
-        const int size = table_->getDataTypeAt(static_cast<unsigned long>(typeId + 1))->getSize();
-        const long numDFS = structure.getNumDFSElements();
-        const long numRaw = structure.getNumRawElements();
-        made.nodes.append(width > 1 ? wrappingAdd(wrappingMultiply(width, numDFS), 1) : numDFS);
-        made.raw.append(wrappingMultiply(width, numRaw));
-        made.nestedAt.push_back(static_cast<std::uint32_t>(made.nested.size()));
-        made.nested.push_back({shared(table_, typeId, structure), typeId, size, width, numDFS, numRaw});
+        made.elements.push_back({element, lastNode, 0, position});
+        made.raw.push_back(raw);
     }
-    made.nodes.finish();
-    made.raw.finish();
     return made;
 }
 
 void ElementIndex::raiseInvalidType() const {
-    table_->checkDataTypeId(record_->getElements()[numbering_.elements.size()]->dataTypeId);
+    const auto first = numbering_.elements.size();
+    table_->checkDataTypeId(record_->getElements()[first]->dataTypeId);
     std::abort(); // not reached: the type is not valid
 }
 
 // --- Places ----------------------------------------------------------------------------------------------------------
 
 const ElementIndex::Nested* ElementIndex::nestedIn(long element) const {
-    const std::uint32_t position = numbering_.nestedAt[static_cast<std::size_t>(element)];
+    const std::uint32_t position = copied(element).nested;
     return position == leaf ? nullptr : &numbering_.nested[position];
+}
+
+long ElementIndex::elementAtNode(long idx) const {
+    return nodes_.find(idx, [this](long i) { return lastNode(i); });
 }
 
 ElementIndex::Place ElementIndex::place(long idx) const {
@@ -150,12 +175,12 @@ ElementIndex::Place ElementIndex::place(long idx) const {
             return at;
         }
     }
-    const long element = numbering_.nodes.find(idx);
+    const long element = elementAtNode(idx);
     if (element == numImmediate()) { // the structure says to have more nodes than its elements have
         if (!numbering_.isComplete) raiseInvalidType();
         return at;
     }
-    const long before = numbering_.nodes[element];
+    const long before = lastNode(element - 1);
     at.element = element;
     at.nested = nestedIn(element);
     if (!at.nested || at.nested->width <= 1) {
@@ -187,7 +212,7 @@ StructElement* ElementIndex::element(long idx) {
     else if (at.isPastTheEnd())
         found = element(idx - at.base);
     else if (at.isArrayNode() || at.isLeaf())
-        found = numbering_.elements[static_cast<std::size_t>(at.element)];
+        found = copied(at.element).element;
     else if (at.isHead(idx))
         found = headOf(at, idx, answer);
     else
@@ -248,9 +273,9 @@ std::unique_ptr<StructElement> ElementIndex::makeHead(const Place& at, const std
 
 // --- Offsets of nodes ------------------------------------------------------------------------------------------------
 
-long ElementIndex::offset(long idx) { return sum(idx, &ElementIndex::offsets_); }
+long ElementIndex::offset(long idx) { return sum(idx, &ElementIndex::offset_); }
 
-long ElementIndex::varDimsOffset(long idx) { return sum(idx, &ElementIndex::varDimsOffsets_); }
+long ElementIndex::varDimsOffset(long idx) { return sum(idx, &ElementIndex::varDimsOffset_); }
 
 long ElementIndex::sum(long idx, Summands ElementIndex::*which) {
     Summands& what = this->*which;
@@ -262,7 +287,7 @@ long ElementIndex::sum(long idx, Summands ElementIndex::*which) {
     if (what.countsInstances && at.instance > 0)
         total = wrappingMultiply(at.instance, at.nested ? at.nested->size : numbering_.size);
     if (at.element >= 0) {
-        long own = what.copies[static_cast<std::size_t>(at.element)];
+        long own = copyOf(at.element, what);
         if (answer || !what.wasAsked(idx)) { // elements that were asked may be gone
             const long now = immediate(at.element).*what.field;
             moved = now != own;
@@ -270,7 +295,7 @@ long ElementIndex::sum(long idx, Summands ElementIndex::*which) {
         }
         total = wrappingAdd(total, own);
     }
-    if (moved && !answer && (what.wasNeverAsked() || what.numMoved > what.copies.size())) {
+    if (moved && !answer && (what.wasNeverAsked() || what.numMoved > numImmediate())) {
         renew(what);
         moved = false;
     }
@@ -297,10 +322,14 @@ long ElementIndex::sum(long idx, Summands ElementIndex::*which) {
 void ElementIndex::renew(Summands& what) {
     writeDown(what);
     what.numMoved = 0;
-    what.copies.clear();
-    what.copies.reserve(numbering_.elements.size());
-    for (const StructElement* element : numbering_.elements)
-        what.copies.push_back(element->*what.field);
+    varDimsOffsets_.resize(numbering_.elements.size());
+    for (long i = 0; i < numImmediate(); ++i)
+        copyOf(i, what) = immediate(i).*what.field;
+}
+
+long& ElementIndex::copyOf(long element, const Summands& what) {
+    const auto position = static_cast<std::size_t>(element);
+    return &what == &offset_ ? numbering_.elements[position].offset : varDimsOffsets_[position];
 }
 
 // --- Written answers -------------------------------------------------------------------------------------------------
@@ -308,8 +337,8 @@ void ElementIndex::renew(Summands& what) {
 CachedElement& ElementIndex::written(long idx, bool takeOwnership) {
     if (CachedElement* const found = findWritten(idx)) return *found;
     StructElement* const element = askedElements_.contains(idx) ? this->element(idx) : nullptr;
-    const long offset = offsets_.wasAsked(idx) ? this->offset(idx) : -1;
-    const long varDimsOffset = varDimsOffsets_.wasAsked(idx) ? this->varDimsOffset(idx) : -1;
+    const long offset = offset_.wasAsked(idx) ? this->offset(idx) : -1;
+    const long varDimsOffset = varDimsOffset_.wasAsked(idx) ? this->varDimsOffset(idx) : -1;
     if (written_->empty()) noteEdit();
     CachedElement& made = (*written_)[idx];
     made.element = element;
@@ -352,11 +381,11 @@ bool ElementIndex::hasWrittenAnswersBelow() {
 void ElementIndex::markElementsAnswered(long limit) {
     const long end = std::min(limit, numbering_.numDFS);
     const long from = std::max(askedElements_.below(), 1L);
-    for (long i = from < end ? numbering_.nodes.find(from) : numImmediate(); i < numImmediate(); ++i) {
-        const std::uint32_t position = numbering_.nestedAt[static_cast<std::size_t>(i)];
+    for (long i = from < end ? elementAtNode(from) : numImmediate(); i < numImmediate(); ++i) {
+        const std::uint32_t position = copied(i).nested;
         if (position == leaf) continue;
         Nested& nested = numbering_.nested[position];
-        const long first = numbering_.nodes[i] + (nested.width > 1 ? 2 : 1);
+        const long first = lastNode(i - 1) + (nested.width > 1 ? 2 : 1);
         if (first >= end) break;
         const std::string& nameNow = immediate(i).name;
         if (!nested.name) nested.name = nameNow;
@@ -372,14 +401,15 @@ void ElementIndex::markElementsAnswered(long limit) {
 // --- Raw values and leaves -------------------------------------------------------------------------------------------
 
 long ElementIndex::elementAtRaw(long rawIdx, long from) const {
-    const long element = numbering_.raw.find(wrappingAdd(rawIdx, 1), from);
+    const long element = raw_.find(
+        wrappingAdd(rawIdx, 1), [this](long i) { return rawEnd(i); }, from);
     if (element == numImmediate() && !numbering_.isComplete) raiseInvalidType();
     return element;
 }
 
 long ElementIndex::rawSpansBefore(long element) const {
     if (element > numImmediate() && !numbering_.isComplete) raiseInvalidType();
-    return numbering_.raw[std::clamp(element, 0L, numImmediate())];
+    return rawEnd(std::clamp(element, 0L, numImmediate()) - 1);
 }
 
 long ElementIndex::rawBefore(long idx) {
@@ -410,14 +440,14 @@ long ElementIndex::rawBeforeInOrder(long idx) {
 long ElementIndex::rawWithin(long idx) {
     if (idx <= 1) return 0;
     readRaw();
-    const long element = numbering_.nodes.find(idx);
+    const long element = elementAtNode(idx);
     if (element == numImmediate()) {
         if (!numbering_.isComplete) raiseInvalidType();
         return rawBefore_.back();
     }
     const long before = rawBefore_[static_cast<std::size_t>(element)];
     const Nested* const nested = nestedIn(element);
-    const long within = idx - numbering_.nodes[element] - 1;
+    const long within = idx - lastNode(element - 1) - 1;
     if (!nested || within == 0) return before;
     ElementIndex& index = nested->index->current();
     if (nested->width <= 1) return wrappingAdd(before, index.rawWithin(within));
@@ -432,9 +462,9 @@ void ElementIndex::readRaw() {
     rawBefore_.assign(1, 0);
     rawBefore_.reserve(numbering_.elements.size() + 1);
     for (long i = 0; i < numImmediate(); ++i) {
-        if (numbering_.nodes[i + 1] >= numbering_.numDFS) break; // no index lies behind it
+        if (lastNode(i) >= numbering_.numDFS) break; // no index lies behind it
         const Nested* const nested = nestedIn(i);
-        long raw = numbering_.raw[i + 1] - numbering_.raw[i];
+        long raw = wrappingSubtract(rawEnd(i), rawEnd(i - 1));
         if (nested) // kept: one instance for a width of 0 or less
             raw = wrappingMultiply(std::max(nested->width, 1L), nested->index->current().rawWithin(nested->numDFS));
         rawBefore_.push_back(wrappingAdd(rawBefore_.back(), raw));
@@ -460,7 +490,7 @@ std::vector<long> ElementIndex::leaves() {
 // Those below `limit` in this numbering, shifted by `base`.
 void ElementIndex::appendLeaves(std::vector<long>& leaves, long base, long limit) {
     for (long i = 0; i < numImmediate(); ++i) {
-        const long first = numbering_.nodes[i] + 1;
+        const long first = lastNode(i - 1) + 1;
         if (first >= limit) return;
         const Nested* const nested = nestedIn(i);
         if (!nested) {
@@ -477,7 +507,7 @@ void ElementIndex::appendLeaves(std::vector<long>& leaves, long base, long limit
         for (long instance = 0; instance < nested->width && start < limit; ++instance, start += nested->numDFS)
             index.appendLeaves(leaves, base + start, std::min(nested->numDFS, limit - start));
     }
-    if (!numbering_.isComplete && numbering_.nodes.total() + 1 < limit) raiseInvalidType();
+    if (!numbering_.isComplete && lastNode(numImmediate() - 1) + 1 < limit) raiseInvalidType();
 }
 
 } // namespace QLTypeSys::structures

@@ -17,6 +17,7 @@
 // the old one goes on answering what the containing structures asked before.
 #pragma once
 
+#include <iterator>
 #include <memory>
 #include <optional>
 #include <string>
@@ -26,7 +27,7 @@
 #include <boost/unordered_map.hpp>
 
 #include "qltypes/structures/AskedSet_internal.h"
-#include "qltypes/structures/PrefixSums_internal.h"
+#include "qltypes/structures/SpanSearch_internal.h"
 #include "qltypes/structures/StructDataType.h"
 
 namespace QLTypeSys::structures {
@@ -92,11 +93,9 @@ class ElementIndex {
 
     int viewId() const { return viewId_; }
     long numDFS() const { return numbering_.numDFS; }
-    const StructElement& immediate(long element) const {
-        return *numbering_.elements[static_cast<std::size_t>(element)];
-    }
+    const StructElement& immediate(long element) const { return *copied(element).element; }
     /// Number of immediate elements, up to the first without a valid type.
-    long numImmediate() const { return numbering_.nodes.size(); }
+    long numImmediate() const { return std::ssize(numbering_.elements); }
     /// The structure nested in an immediate element; null for a leaf.
     const Nested* nestedIn(long element) const;
 
@@ -128,37 +127,52 @@ class ElementIndex {
 
     static constexpr std::uint32_t leaf = 0xffffffff;
 
+    // What is copied of an immediate element, in half a cache line.
+    struct Immediate {
+        StructElement* element;
+        long lastNode;        // depth-first index of its last node
+        long offset;          // as it was when answers were first given
+        std::uint32_t nested; // position among the nested structures, or leaf
+
+        bool operator==(const Immediate& other) const {
+            return element == other.element && lastNode == other.lastNode && nested == other.nested;
+        }
+    };
+
     // A copy of all that the places of nodes depend on.
     struct Numbering {
-        std::vector<StructElement*> elements; // those in front of the first without a valid type
-        bool isComplete = true;               // there is none without a valid type
-        int size = -1;                        // bytes of the structure
-        long numDFS = 0;
-        PrefixSums nodes;                    // depth-first nodes of each element, the root not counted
-        PrefixSums raw;                      // scalar values of each element, by the counts of nested structures
-        std::vector<std::uint32_t> nestedAt; // position in `nested`, or leaf
+        std::vector<Immediate> elements; // those in front of the first without a valid type
+        std::vector<long> raw; // scalar values up to the end of each element, by the counts of nested structures
         std::vector<Nested> nested;
+        long numDFS = 0;
+        int size = -1;          // bytes of the structure
+        bool isComplete = true; // there is no element without a valid type
 
         bool operator==(const Numbering&) const = default;
     };
+
+    struct NestedType;
 
     // One of the two answers that add up along the way to a node.
     struct Summands {
         long StructElement::*const field;
         long CachedElement::*const answer;
         const bool countsInstances;
-        std::vector<long> copies = {}; // of the field, by immediate element
         AskedSet asked = {};
         AskedSet askedOverUnset = {}; // those whose nested answer was -1, which the nested structure does not keep
-        std::size_t numMoved = 0;     // answers written down because their field differs from the copy
+        long numMoved = 0;            // answers written down because their field differs from the copy
 
         bool wasAsked(long idx) const { return asked.contains(idx) || askedOverUnset.contains(idx); }
         bool wasNeverAsked() const { return asked.isEmpty() && askedOverUnset.isEmpty(); }
     };
 
-    static ElementIndex& under(const DataTypeTable* table, int id, StructDataType& record);
     static const std::shared_ptr<ElementIndex>& shared(const DataTypeTable* table, int id, StructDataType& record);
 
+    const Immediate& copied(long element) const { return numbering_.elements[static_cast<std::size_t>(element)]; }
+    long lastNode(long element) const { return element < 0 ? 0 : copied(element).lastNode; }
+    long rawEnd(long element) const { return element < 0 ? 0 : numbering_.raw[static_cast<std::size_t>(element)]; }
+    long elementAtNode(long idx) const;
+    long& copyOf(long element, const Summands& what);
     Numbering read() const;
     CachedElement* findWritten(long idx);
     long sum(long idx, Summands ElementIndex::*which);
@@ -182,13 +196,15 @@ class ElementIndex {
     int viewId_;
     StructDataType* record_; // null once the structure let go of this index
     Numbering numbering_;
+    SpanSearch nodes_, raw_;           // in the numbering
+    std::vector<long> varDimsOffsets_; // copied as the offsets of the elements are
     unsigned long readAt_ = 0;
 
     boost::unordered_map<long, CachedElement>* written_; // the record's, or the own one
     boost::unordered_map<long, CachedElement> ownWritten_;
     AskedSet askedElements_;
-    Summands offsets_{&StructElement::offset, &CachedElement::offset, true};
-    Summands varDimsOffsets_{&StructElement::varDimsOffset, &CachedElement::varDimsOffset, false};
+    Summands offset_{&StructElement::offset, &CachedElement::offset, true};
+    Summands varDimsOffset_{&StructElement::varDimsOffset, &CachedElement::varDimsOffset, false};
     std::vector<std::unique_ptr<StructElement>> made_; // roots and heads
     StructElement* root_ = nullptr;
     std::vector<std::shared_ptr<ElementIndex>> kept_; // of structures that were nested when answers were written down

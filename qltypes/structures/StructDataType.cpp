@@ -5,6 +5,7 @@
 
 #include "qltypes/structures/Arithmetic_internal.h"
 #include "qltypes/structures/ElementIndex_internal.h"
+#include "qltypes/structures/TypeMemo_internal.h"
 #include "qltypes/types/DataTypeTable.h"
 
 using QLTypeSys::DataType;
@@ -69,38 +70,74 @@ std::vector<int> StructDataType::dependsOn() const {
 
 // --- Derived flags ---------------------------------------------------------------------------------------------------
 
+namespace {
+
+// What the flags of a structure depend on in an element's type.
+struct ElementFlags {
+    bool isPlainCopy, isPlainConstruct, isPlainDestroy, isString, isHalf;
+    StructDataType* nested; // null for a leaf
+
+    ElementFlags(const DataTypeTable* table, int id) {
+        DataType* const resolved = table->getDataTypeAliasedThruTo(id); // raises for an invalid id
+        const DataType* const entry = table->getDataTypeAt(static_cast<unsigned long>(id + 1));
+        isPlainCopy = entry->getPlainCopy();
+        isPlainConstruct = entry->getPlainConstruct();
+        isPlainDestroy = entry->getPlainDestroy();
+        isString = resolved->getIsType(QLTypeSys::dtqString);
+        isHalf = entry->isHalf();
+        nested = id != DATA_TYPE_ID_AUTO && resolved->getIsType(QLTypeSys::dtqStruct)
+                     ? static_cast<StructDataType*>(resolved)
+                     : nullptr;
+    }
+};
+
+} // namespace
+
 FrequentlyAccessedProperties StructDataType::cacheForFrequentlyAccessedProperties(const DataTypeTable* table) {
     if (propertiesCached_) return derived_;
-    derived_ = {};
-    plainCopy_ = plainConstruct_ = plainDestroy_ = true;
+    propertiesCached_ = true; // before the walk: so it ends in a faulty structure that contains itself
+    try {
+        derived_ = derive(table);
+    } catch (...) {
+        propertiesCached_ = false;
+        throw;
+    }
+    return derived_;
+}
+
+FrequentlyAccessedProperties StructDataType::derive(const DataTypeTable* table) {
+    FrequentlyAccessedProperties found{};
+    bool isPlainCopy = true;
+    bool isPlainConstruct = true;
+    bool isPlainDestroy = true;
+    QLTypeSys::structures::TypeMemo<ElementFlags, const DataTypeTable*> types(table);
     for (const StructElement* element : elements_) {
-        const int typeId = element->dataTypeId;
+        const ElementFlags& type = types.of(element->dataTypeId);
         bool frame = element->samplingMode == 1;
         bool varDims = element->dimensionsMode == 1;
-        DataType* const resolved = table->getDataTypeAliasedThruTo(typeId);
-        if (typeId == DATA_TYPE_ID_AUTO || !resolved->getIsType(QLTypeSys::dtqStruct)) {
-            const DataType* const entry = table->getDataTypeAt(static_cast<unsigned long>(typeId + 1));
-            plainCopy_ &= entry->getPlainCopy();
-            plainConstruct_ &= entry->getPlainConstruct();
-            plainDestroy_ &= entry->getPlainDestroy();
-            derived_.hasComplexData |= element->signalType == 1;
-            derived_.hasStringData |= resolved->getIsType(QLTypeSys::dtqString);
-            derived_.hasHalfPrecisionData |= entry->isHalf();
+        if (!type.nested) {
+            isPlainCopy &= type.isPlainCopy;
+            isPlainConstruct &= type.isPlainConstruct;
+            isPlainDestroy &= type.isPlainDestroy;
+            found.hasComplexData |= element->signalType == 1;
+            found.hasStringData |= type.isString;
+            found.hasHalfPrecisionData |= type.isHalf;
         } else { // kept: the plain flags do not pass through a nested structure
-            const FrequentlyAccessedProperties nested =
-                static_cast<StructDataType*>(resolved)->cacheForFrequentlyAccessedProperties(table);
-            derived_.hasAOB |= !element->isScalar() || varDims || nested.hasAOB;
+            const FrequentlyAccessedProperties nested = type.nested->cacheForFrequentlyAccessedProperties(table);
+            found.hasAOB |= !element->isScalar() || varDims || nested.hasAOB;
             frame |= nested.hasFrameBasedElements;
             varDims |= nested.hasVarDims;
-            derived_.hasComplexData |= nested.hasComplexData;
-            derived_.hasStringData |= nested.hasStringData;
-            derived_.hasHalfPrecisionData |= nested.hasHalfPrecisionData;
+            found.hasComplexData |= nested.hasComplexData;
+            found.hasStringData |= nested.hasStringData;
+            found.hasHalfPrecisionData |= nested.hasHalfPrecisionData;
         }
-        derived_.hasFrameBasedElements |= frame;
-        derived_.hasVarDims |= varDims;
+        found.hasFrameBasedElements |= frame;
+        found.hasVarDims |= varDims;
     }
-    propertiesCached_ = true;
-    return derived_;
+    plainCopy_ = isPlainCopy;
+    plainConstruct_ = isPlainConstruct;
+    plainDestroy_ = isPlainDestroy;
+    return found;
 }
 
 FrequentlyAccessedProperties StructDataType::createCacheForFrequentlyAccessedProperties(const DataTypeTable* table) {

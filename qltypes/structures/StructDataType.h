@@ -139,6 +139,7 @@ class QL_EXPORT StructDataType : public QLTypeSys::DataType {
     boost::unordered_map<long, CachedElement> cachedElements_;
 
   private:
+    FrequentlyAccessedProperties derive(const QLTypeSys::DataTypeTable* table);
     void noteEdit() const;
 
     bool dfsIdxFromFlatIdxIsSorted_ = true;

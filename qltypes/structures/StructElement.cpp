@@ -7,7 +7,6 @@
 #include "qltypes/structures/ElementIndex_internal.h"
 
 using QLTypeSys::structures::narrowed;
-using QLTypeSys::structures::wrappingMultiply;
 
 namespace {
 
@@ -64,13 +63,6 @@ const int* StructElement::getDimensionsAsInt(const ObsoleteIntDimsKey&) {
         std::transform(dims, dims + numDims, intDims, narrowed);
     }
     return intDims;
-}
-
-long StructElement::getWidth() const {
-    long width = 1;
-    for (int i = 0; i < static_cast<int>(numDims); ++i)
-        width = wrappingMultiply(width, dims[i]);
-    return width;
 }
 
 bool StructElement::isScalar() const {

@@ -70,7 +70,12 @@ struct QL_EXPORT StructElement {
     /// Null without dimensions. Owned by the element; good until its number of dimensions changes.
     const int* getDimensionsAsInt(const ObsoleteIntDimsKey& key);
     /// Product of the dimensions; 1 without any. Wraps around beyond 64 bits.
-    long getWidth() const;
+    long getWidth() const {
+        unsigned long width = 1;
+        for (int i = 0; i < static_cast<int>(numDims); ++i)
+            width *= static_cast<unsigned long>(dims[i]);
+        return static_cast<long>(width);
+    }
     /// Whether there are no dimensions or all of them are 1.
     bool isScalar() const;
 

@@ -8,6 +8,7 @@
 #include "qltypes/structures/Arithmetic_internal.h"
 #include "qltypes/structures/StructDataType.h"
 #include "qltypes/structures/StructDataTypeUtils.h"
+#include "qltypes/structures/TypeMemo_internal.h"
 #include "qltypes/types/DataTypeTable.h"
 #include "qltypes/types/DataTypeTableUtils.h"
 
@@ -26,24 +27,34 @@ unsigned long roundedUp(unsigned long offset, unsigned long powerOfTwo) {
 
 // What the pass needs of an element's type.
 struct ElementType {
-    const DataType* entry;        // as the table has it; its size and ground count
-    const DataType* resolved;     // at the end of the alias chain
     const StructDataType* nested; // null for a leaf
+    const void* ground;
+    unsigned long size;
+    unsigned long alignment; // 0: by DtCorrectOffsetForProperAlignment
+    bool groundHasNonZero;   // as the type says; its bytes may say otherwise
+    bool groundIsZero;       // all bytes
 
-    ElementType(const DataTypeTable* table, int id)
-        : entry(table->getDataTypeAt(static_cast<unsigned long>(id + 1))),
-          resolved(table->getDataTypeAliasedThruTo(id)),
-          nested(id != DATA_TYPE_ID_AUTO && resolved->getIsType(QLTypeSys::dtqStruct)
+    ElementType(const DataTypeTable* table, int id) {
+        const DataType* const resolved = table->getDataTypeAliasedThruTo(id); // raises for an invalid id
+        const DataType* const entry = table->getDataTypeAt(static_cast<unsigned long>(id + 1));
+        nested = id != DATA_TYPE_ID_AUTO && resolved->getIsType(QLTypeSys::dtqStruct)
                      ? static_cast<const StructDataType*>(resolved)
-                     : nullptr) {}
+                     : nullptr;
+        ground = entry->getGround();
+        const int bytes = entry->getSize();
+        size = static_cast<unsigned long>(bytes);
+        alignment = bytes > 7 ? 8 : bytes > 3 ? 4 : bytes > 1 ? 2 : 1;
+        if (CheckForBuiltInDataType(entry->getIdAliasedThruTo()) && size != alignment) alignment = 0;
+        groundHasNonZero = resolved->groundHasNonZeroStoredValue();
+        const auto* const first = static_cast<const unsigned char*>(ground);
+        groundIsZero =
+            !first || bytes <= 0 || std::all_of(first, first + bytes, [](unsigned char b) { return b == 0; });
+    }
 
     unsigned long aligned(unsigned long offset) const {
-        const int size = entry->getSize();
-        if (CheckForBuiltInDataType(entry->getIdAliasedThruTo())) {
-            bool overflow;
-            return DtCorrectOffsetForProperAlignment(offset, static_cast<unsigned long>(size), &overflow);
-        }
-        return roundedUp(offset, size > 7 ? 8 : size > 3 ? 4 : size > 1 ? 2 : 1);
+        if (alignment != 0) return roundedUp(offset, alignment);
+        bool overflow;
+        return DtCorrectOffsetForProperAlignment(offset, size, &overflow);
     }
 };
 
@@ -64,6 +75,8 @@ struct StructLayoutPass {
     long numRaw = 0;
     long numDFS = 1; // the root
     bool groundHasNonZero = false;
+    bool groundIsZero = true;
+    TypeMemo<ElementType, const DataTypeTable*> types{table};
 
     qlsvDiagnosticImpl* run();
     bool place(StructElement& element, bool isLast);
@@ -72,12 +85,13 @@ struct StructLayoutPass {
 
 // False when the structure grew beyond the limit.
 bool StructLayoutPass::place(StructElement& element, bool isLast) {
-    const ElementType type(table, element.dataTypeId);
-    if (!groundHasNonZero) groundHasNonZero = type.resolved->groundHasNonZeroStoredValue();
+    const ElementType& type = types.of(element.dataTypeId);
+    groundHasNonZero |= type.groundHasNonZero;
+    groundIsZero &= type.groundIsZero;
     offset = type.aligned(offset);
     element.setOffset(static_cast<long>(offset));
     const long width = complexWidth(element);
-    offset += static_cast<unsigned long>(type.entry->getSize()) * static_cast<unsigned long>(width);
+    offset += type.size * static_cast<unsigned long>(width);
     if (type.nested) { // kept: a nested structure whose element says complex counts twice
         numRaw = wrappingAdd(numRaw, wrappingMultiply(width, type.nested->getNumRawElements()));
         numFlat = wrappingAdd(numFlat, wrappingMultiply(width, type.nested->getNumFlatElements()));
@@ -94,14 +108,13 @@ bool StructLayoutPass::place(StructElement& element, bool isLast) {
 // Writes each element's ground, side by side as often as it is wide. Padding stays as it is.
 void StructLayoutPass::buildGround() {
     for (const StructElement* element : record.elements_) {
-        const DataType* const type = table->getDataTypeAt(static_cast<unsigned long>(element->dataTypeId + 1));
-        const void* const ground = type->getGround();
-        const long size = type->getSize();
+        const ElementType& type = types.of(element->dataTypeId);
+        const auto size = static_cast<long>(type.size);
         const long room = record.size_ - element->offset; // widths below 0 let elements lie past the end
         const long bytes = std::min(wrappingMultiply(size, complexWidth(*element)), room);
-        if (!ground || bytes < size || size <= 0) continue;
+        if (!type.ground || bytes < size || size <= 0) continue;
         unsigned char* const first = record.ground_ + element->offset;
-        std::memcpy(first, ground, static_cast<std::size_t>(size));
+        std::memcpy(first, type.ground, type.size);
         for (long done = size; done < bytes;) { // what is written doubles with each step
             const long step = std::min(done, bytes - done);
             std::memcpy(first + done, first, static_cast<std::size_t>(step));
@@ -122,9 +135,10 @@ qlsvDiagnosticImpl* StructLayoutPass::run() {
     record.setNumFlatElements(numFlat);
     record.setNumRawElements(numRaw);
     record.setNumDFSElements(numDFS);
+    const bool isFirstLayout = record.getSize() == -1; // then the ground starts zero-filled
     record.setSize(static_cast<int>(offset));
     record.setGroundHasNonZeroStoredValue(groundHasNonZero);
-    buildGround();
+    if (!groundIsZero || !isFirstLayout) buildGround();
     return nullptr;
 }
 
