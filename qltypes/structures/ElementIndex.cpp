@@ -4,6 +4,7 @@
 #include <atomic>
 #include <cmath>
 
+#include "qltypes/host/Failure_internal.h"
 #include "qltypes/structures/Arithmetic_internal.h"
 #include "qltypes/structures/TypeMemo_internal.h"
 #include "qltypes/types/DataTypeTable.h"
@@ -107,7 +108,7 @@ ElementIndex& ElementIndex::current() {
         renew(offset_);
         renew(varDimsOffset_);
     }
-    readAt_ = numbering_.isComplete ? now : 0;
+    readAt_ = numbering_.invalidTypeId ? 0 : now;
     return *this;
 }
 
@@ -123,7 +124,7 @@ ElementIndex::Numbering ElementIndex::read() const {
     long raw = 0;
     for (StructElement* element : elements) {
         if (!table_->isDataTypeIdValid(element->dataTypeId)) {
-            made.isComplete = false;
+            made.invalidTypeId = element->dataTypeId;
             break;
         }
         element->isIndexed_ = true;
@@ -147,9 +148,7 @@ ElementIndex::Numbering ElementIndex::read() const {
 }
 
 void ElementIndex::raiseInvalidType() const {
-    const auto first = numbering_.elements.size();
-    table_->checkDataTypeId(record_->getElements()[first]->dataTypeId);
-    std::abort(); // not reached: the type is not valid
+    failure::raise("QuillaneTypes:general", "InvalidDataTypeId", *numbering_.invalidTypeId);
 }
 
 // --- Places ----------------------------------------------------------------------------------------------------------
@@ -177,7 +176,7 @@ ElementIndex::Place ElementIndex::place(long idx) const {
     }
     const long element = elementAtNode(idx);
     if (element == numImmediate()) { // the structure says to have more nodes than its elements have
-        if (!numbering_.isComplete) raiseInvalidType();
+        if (numbering_.invalidTypeId) raiseInvalidType();
         return at;
     }
     const long before = lastNode(element - 1);
@@ -379,6 +378,7 @@ bool ElementIndex::hasWrittenAnswersBelow() {
 
 // As if element() had been called for every index below the limit.
 void ElementIndex::markElementsAnswered(long limit) {
+    if (numbering_.invalidTypeId) limit = std::min(limit, lastNode(numImmediate() - 1) + 1);
     const long end = std::min(limit, numbering_.numDFS);
     const long from = std::max(askedElements_.below(), 1L);
     for (long i = from < end ? elementAtNode(from) : numImmediate(); i < numImmediate(); ++i) {
@@ -403,12 +403,12 @@ void ElementIndex::markElementsAnswered(long limit) {
 long ElementIndex::elementAtRaw(long rawIdx, long from) const {
     const long element = raw_.find(
         wrappingAdd(rawIdx, 1), [this](long i) { return rawEnd(i); }, from);
-    if (element == numImmediate() && !numbering_.isComplete) raiseInvalidType();
+    if (element == numImmediate() && numbering_.invalidTypeId) raiseInvalidType();
     return element;
 }
 
 long ElementIndex::rawSpansBefore(long element) const {
-    if (element > numImmediate() && !numbering_.isComplete) raiseInvalidType();
+    if (element > numImmediate() && numbering_.invalidTypeId) raiseInvalidType();
     return rawEnd(std::clamp(element, 0L, numImmediate()) - 1);
 }
 
@@ -442,7 +442,7 @@ long ElementIndex::rawWithin(long idx) {
     readRaw();
     const long element = elementAtNode(idx);
     if (element == numImmediate()) {
-        if (!numbering_.isComplete) raiseInvalidType();
+        if (numbering_.invalidTypeId) raiseInvalidType();
         return rawBefore_.back();
     }
     const long before = rawBefore_[static_cast<std::size_t>(element)];
@@ -507,7 +507,7 @@ void ElementIndex::appendLeaves(std::vector<long>& leaves, long base, long limit
         for (long instance = 0; instance < nested->width && start < limit; ++instance, start += nested->numDFS)
             index.appendLeaves(leaves, base + start, std::min(nested->numDFS, limit - start));
     }
-    if (!numbering_.isComplete && lastNode(numImmediate() - 1) + 1 < limit) raiseInvalidType();
+    if (numbering_.invalidTypeId && lastNode(numImmediate() - 1) + 1 < limit) raiseInvalidType();
 }
 
 } // namespace QLTypeSys::structures

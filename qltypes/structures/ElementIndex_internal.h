@@ -145,8 +145,8 @@ class ElementIndex {
         std::vector<long> raw; // scalar values up to the end of each element, by the counts of nested structures
         std::vector<Nested> nested;
         long numDFS = 0;
-        int size = -1;          // bytes of the structure
-        bool isComplete = true; // there is no element without a valid type
+        int size = -1;                    // bytes of the structure
+        std::optional<int> invalidTypeId; // of the first element without a valid type
 
         bool operator==(const Numbering&) const = default;
     };

@@ -193,6 +193,7 @@ std::vector<unsigned long> DtGetDataTypeFullHierarchyOffset(const DataTypeTable*
     std::vector<unsigned long> offsets;
     appendLeafOffsets(table, id, 0, offsets);
     const std::size_t numLeaves = offsets.size();
+    if (numLeaves == 0) return offsets;
     std::size_t numOffsets;
     if (__builtin_mul_overflow(numInstances, numLeaves, &numOffsets) || numOffsets >= 1ul << 61)
         throw std::length_error("vector::reserve");

@@ -343,6 +343,7 @@ class QL_EXPORT DataTypeTable {
     void initialize();
     static void fillFromRow(DataType* record, const FixedType& row);
     static void clearStructureCaches(DataType* record);
+    static void noteStructureEdit();
     DataType* recordAt(int id) const { return dataTypes_[static_cast<std::size_t>(id + 1)]; }
     /// Whether `name` is registered and stands as it is; `existing` is its id in any case.
     bool isRegisteredAlready(const char* name, DataTypeSource source, int& existing) const;

@@ -96,6 +96,7 @@ void DataTypeTable::setDataTypeIdAliasedTo(int id, int target) {
         // kept: an alias that ended here now ends at the new alias and forwards in two hops
         if (other->getIdAliasedThruTo() == id) other->updateAliasedThruToType(alias);
     }
+    noteStructureEdit(); // an element of this type may be a nested structure now
     delete record;
 }
 

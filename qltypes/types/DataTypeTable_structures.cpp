@@ -1,5 +1,6 @@
 // What the table knows of structures.
 #include "qltypes/structures/ElementAccess.h"
+#include "qltypes/structures/ElementIndex_internal.h"
 #include "qltypes/structures/StructDataType.h"
 #include "qltypes/types/DataTypeTable.h"
 
@@ -15,6 +16,8 @@ int DataTypeTable::registerStructDataType(const char* name, DataTypeSource sourc
 void DataTypeTable::clearStructureCaches(DataType* record) {
     if (record->getIsType(dtqStruct)) static_cast<StructDataType*>(record)->clearDFSCache();
 }
+
+void DataTypeTable::noteStructureEdit() { structures::noteEdit(); }
 
 namespace {
 
