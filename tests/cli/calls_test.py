@@ -243,14 +243,32 @@ Lever
             {"name": "Label", "string": 32}, {"name": "Text", "string": "dynamic"},
             {"name": "Curve", "matrix": {"of": "double", "rank": 2}},
             {"name": "Frame", "image": {"format": "RGB", "layout": "row", "base": "uint8", "channels": 3}},
+            {"name": "Stamp", "dateTime": "utc"},
             {"name": "P", "elements": [{"name": "l", "type": "Label"}, {"name": "c", "type": "Curve"}]}]}))
         document = json.loads(run("layout", path, "--json")[1])
         self.assertEqual([(each["name"], each["kind"], each["aliasOf"]) for each in document["types"]], [
             ("Label", "string", "str32"), ("Text", "string", "string"), ("Curve", "matrix", "dynmat_double_2d_t"),
-            ("Frame", "image", "Image_RGB_Row_uint8")])
+            ("Frame", "image", "Image_RGB_Row_uint8"), ("Stamp", "date-time", "utc")])
         sizes = {each["name"]: each["size"] for each in document["types"]}
         elements = document["structures"][0]["elements"]
         self.assertEqual([each["size"] for each in elements], [sizes["Label"], sizes["Curve"]])
+
+    def test_checksum(self):
+        path = self.write("sum.json", json.dumps({"types": [{"name": "P", "elements": [
+            {"name": "pos", "type": "double", "dimensions": [3]},
+            {"name": "iq", "type": "single", "complex": True},
+            {"name": "m", "type": "int16", "dimensions": [2, 3]}]}]}))
+        structure = json.loads(run("layout", path, "--checksum", "--json")[1])["structures"][0]
+        texts = ["double:pos:[ 3 ];", "single:iq:[ 1 ]:complex;", "int16:m:[ 2 3 ];"]
+        self.assertEqual(structure["checksum"]["descriptions"], texts)
+        digest = structure["checksum"]["digest"]
+        self.assertRegex(digest, "^[0-9a-f]{32}$")
+        out = run("layout", path, "--checksum")[1]
+        for text in texts + ["checksum " + digest]:
+            self.assertIn(text, out)
+        renamed = self.write("renamed.json", pathlib.Path(path).read_text().replace('"iq"', '"qi"'))
+        other = json.loads(run("layout", renamed, "--checksum", "--json")[1])["structures"][0]
+        self.assertNotEqual(other["checksum"]["digest"], digest)
 
     def test_messages(self):
         self.write("demo_msgs/msg/Stamped.msg", "time stamp\nuint8 flag\nint64 count\n")

@@ -18,6 +18,7 @@
 #include "output/LayoutJson.h"
 #include "output/LayoutText.h"
 #include "output/Output.h"
+#include "table/ChecksumReader.h"
 #include "table/NodeReader.h"
 #include "table/TypeLoader.h"
 
@@ -118,6 +119,7 @@ void addLayoutCommand(CLI::App& app) {
         std::string format;
         bool withPadding = false;
         bool withNumberings = false;
+        bool withChecksum = false;
         bool asJson = false;
     };
     const auto options = std::make_shared<Options>();
@@ -131,18 +133,22 @@ void addLayoutCommand(CLI::App& app) {
     CLI::Option* const numberings =
         command->add_flag("--numberings", options->withNumberings,
                           "Number each node too: depth-first, flat, raw and immediate, with its full path");
+    CLI::Option* const checksum = command->add_flag(
+        "--checksum", options->withChecksum, "Show the text by which each element enters the checksum, and the digest");
     CLI::Option* const node =
         command
             ->add_option("--node", options->node,
                          "Show one node of the one structure: its depth-first number, or its full path such as y(1).b")
-            ->excludes(numberings);
+            ->excludes(numberings)
+            ->excludes(checksum);
     CLI::Option* const json = command->add_flag("--json", options->asJson, "Print JSON with stable keys");
     CLI::Option* const format =
         command->add_option("--format", options->format, "c: print a C header that asserts every size and offset")
             ->check(CLI::IsMember({"c"}))
             ->excludes(json)
             ->excludes(node)
-            ->excludes(numberings);
+            ->excludes(numberings)
+            ->excludes(checksum);
     command->add_flag("--padding", options->withPadding, "Declare padding as members of the C structures")
         ->needs(format);
     command->footer(
@@ -175,6 +181,10 @@ void addLayoutCommand(CLI::App& app) {
         if (options->withNumberings) {
             for (StructureLayout& structure : layout.structures)
                 structure.nodes = NodeReader(table, loader, structure.name).nodes();
+        }
+        if (options->withChecksum) {
+            for (StructureLayout& structure : layout.structures)
+                structure.checksum = checksumOf(table, structure.name);
         }
         print(options->asJson ? layoutJson(layout) : layoutText(layout, !options->only.empty(), coloursOfOutput()));
     });

@@ -64,7 +64,7 @@ struct StructureDescription {
     std::vector<ElementDescription> elements;
 };
 
-/// Texts. The library names the type; the described name is another one for it, here and for the next two.
+/// Texts. The library names the type; the described name is another one for it, here and for the next three.
 struct StringDescription {
     unsigned long maxLength = 0; ///< in UTF-16 units; 0 where there is no limit
 };
@@ -80,6 +80,11 @@ struct ImageDescription {
     bool isRowMajor = false;
     std::string base;
     unsigned long numChannels = 0;
+};
+
+/// A moment on a scale of time, with the scale's own epoch, range and storage.
+struct DateTimeDescription {
+    std::string scale;
 };
 
 struct EnumerationMember {
@@ -98,7 +103,7 @@ struct TypeDescription {
     std::string label; ///< the name as its input writes it, for people
     Place place;
     std::variant<AliasDescription, ClientTypeDescription, StructureDescription, EnumerationDescription,
-                 StringDescription, MatrixDescription, ImageDescription>
+                 StringDescription, MatrixDescription, ImageDescription, DateTimeDescription>
         kind;
 };
 

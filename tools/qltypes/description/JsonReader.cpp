@@ -226,12 +226,13 @@ MatrixDescription readMatrix(const Node& node) {
 }
 
 TypeDescription readType(const Node& node) {
-    node.asObject({"name", "alias", "size", "elements", "members", "storage", "string", "matrix", "image"});
+    node.asObject({"name", "alias", "size", "elements", "members", "storage", "string", "matrix", "image", "dateTime"});
     TypeDescription type;
     type.name = node.at("name").asIdentifier();
     type.label = type.name;
     type.place = node.place();
-    constexpr std::array<const char*, 7> kinds = {"alias", "size", "elements", "members", "string", "matrix", "image"};
+    constexpr std::array<const char*, 8> kinds = {"alias",  "size",   "elements", "members",
+                                                  "string", "matrix", "image",    "dateTime"};
     if (std::count_if(kinds.begin(), kinds.end(), [&](const char* kind) { return node.has(kind); }) != 1)
         node.complain(fmt::format("must have exactly one of the keys '{}'", fmt::join(kinds, "', '")));
     if (node.has("storage") && !node.has("members")) node.complain("must have the key 'members' beside 'storage'");
@@ -247,6 +248,8 @@ TypeDescription readType(const Node& node) {
         type.kind = readMatrix(node.at("matrix"));
     else if (node.has("image"))
         type.kind = readImage(node.at("image"));
+    else if (node.has("dateTime"))
+        type.kind = DateTimeDescription{readWord(node.at("dateTime"), {"tai", "gps", "utc", "posix", "jd", "mjd"})};
     else
         type.kind = readStructure(node.at("elements"));
     return type;

@@ -61,6 +61,12 @@ struct NodeLayout {
     std::optional<std::pair<std::string, std::int64_t>> parent; ///< label of the structure around it, index in that
 };
 
+/// How a structure enters a checksum.
+struct ChecksumLayout {
+    std::vector<std::string> descriptions; ///< one text an element, in order
+    std::string digest;                    ///< four words of 32 bits, each as eight hexadecimal digits
+};
+
 struct StructureLayout {
     std::string name;
     std::string label;
@@ -70,13 +76,14 @@ struct StructureLayout {
     std::int64_t numRawElements = 0;
     std::int64_t numDFSElements = 0;
     std::vector<ElementLayout> elements;
-    std::vector<NodeLayout> nodes; ///< in depth-first order; empty unless they were asked for
+    std::vector<NodeLayout> nodes;          ///< in depth-first order; empty unless they were asked for
+    std::optional<ChecksumLayout> checksum; ///< where it was asked for
 };
 
 /// A type that is no structure and not built in.
 struct OtherType {
     std::string name;
-    std::string kind;   ///< "alias", "number", "client", "enumeration", "string", "matrix" or "image"
+    std::string kind;   ///< "alias", "number", "client", "enumeration", "string", "matrix", "image" or "date-time"
     std::string target; ///< the label of what an alias stands for
     std::int64_t size = 0;
     std::string storage; ///< of an enumeration: the type that holds its values

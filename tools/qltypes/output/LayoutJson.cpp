@@ -76,6 +76,8 @@ Json structureJson(const StructureLayout& structure) {
         {"elements", arrayOf(structure.elements, elementJson)},
     };
     if (!structure.nodes.empty()) json["nodes"] = arrayOf(structure.nodes, toJson);
+    if (structure.checksum)
+        json["checksum"] = {{"descriptions", structure.checksum->descriptions}, {"digest", structure.checksum->digest}};
     return json;
 }
 

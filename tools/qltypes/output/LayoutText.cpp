@@ -76,6 +76,13 @@ std::string structureText(const StructureLayout& structure, const Colours& colou
                        structure.numDFSElements);
 }
 
+std::string checksumText(const StructureLayout& structure, const Colours& colours) {
+    TextTable table({{"element", Align::Left}, {"enters the checksum as", Align::Left}});
+    for (std::size_t i = 0; i < structure.elements.size(); ++i)
+        table.addRow({structure.elements[i].name, structure.checksum->descriptions[i]});
+    return fmt::format("{}  checksum {}\n\n", table.text("  ", colours), structure.checksum->digest);
+}
+
 std::string kindText(const OtherType& type) {
     if (!type.target.empty()) return "alias of " + type.target;
     if (type.members.empty()) return type.kind;
@@ -127,8 +134,11 @@ std::string summaryText(const Layout& layout) {
 std::string layoutText(const Layout& layout, bool isSelection, const Colours& colours) {
     std::string text;
     if (!isSelection && !layout.otherTypes.empty()) text += otherTypesText(layout.otherTypes, colours);
-    for (const StructureLayout& structure : layout.structures)
-        text += structureText(structure, colours) + (structure.nodes.empty() ? "" : nodesText(structure, colours));
+    for (const StructureLayout& structure : layout.structures) {
+        text += structureText(structure, colours);
+        if (!structure.nodes.empty()) text += nodesText(structure, colours);
+        if (structure.checksum) text += checksumText(structure, colours);
+    }
     if (!isSelection && !layout.refusals.empty()) text += refusalsText(layout.refusals, colours);
     return text + summaryText(layout);
 }

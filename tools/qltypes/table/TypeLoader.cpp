@@ -11,6 +11,7 @@
 #include "description/Resolver.h"
 #include "qlplatform/classes/DefinedClass.h"
 #include "qlplatform/services/Diagnostics.h"
+#include "qltypes/date_time/DateTimeType.h"
 #include "qltypes/fixed_point/IdentifierString.h"
 #include "qltypes/fixed_point/TypeNames.h"
 #include "qltypes/image/ImageDataType.h"
@@ -64,6 +65,14 @@ SSImageColorFormat formatOf(const std::string& name) {
         {"Lab", SSImageColorFormat_Lab},       {"HSV", SSImageColorFormat_HSV},
         {"YUV444", SSImageColorFormat_YUV444}, {"CFA", SSImageColorFormat_CFA}};
     return formats.at(name);
+}
+
+QLDateTime::AbsoluteTimeScale scaleOf(const std::string& name) {
+    using QLDateTime::AbsoluteTimeScale;
+    static const std::map<std::string, AbsoluteTimeScale> scales = {
+        {"tai", AbsoluteTimeScale::TAI},     {"gps", AbsoluteTimeScale::GPS},   {"utc", AbsoluteTimeScale::UTC},
+        {"posix", AbsoluteTimeScale::Posix}, {"jd", AbsoluteTimeScale::JD_TAI}, {"mjd", AbsoluteTimeScale::MJD_TAI}};
+    return scales.at(name);
 }
 
 // Why an element that would begin at `from` begins elsewhere.
@@ -123,13 +132,17 @@ void TypeLoader::registerType(const TypeDescription& type) {
     }
 }
 
-// Strings, matrices and images: the library makes the name, and the described one becomes an alias of it.
+// Strings, matrices, images and date-time types: the library makes the name, and the described one becomes an alias of
+// it.
 void TypeLoader::registerUnderOwnName(const TypeDescription& type) {
     const int id = checked(type.place, [&] {
         if (const auto* string = std::get_if<StringDescription>(&type.kind))
             return table_.registerStringDataType(string->maxLength, nullptr);
         if (const auto* matrix = std::get_if<MatrixDescription>(&type.kind))
             return table_.registerDynamicMatrixDataType(idOf(matrix->element), matrix->rank);
+        if (const auto* dateTime = std::get_if<DateTimeDescription>(&type.kind))
+            return table_.registerDateTimeDataType(QLDateTime::DateTimeType::datetime_t(scaleOf(dateTime->scale)),
+                                                   nullptr);
         const auto& image = std::get<ImageDescription>(type.kind);
         return table_.registerImageDataType(image.numChannels, formatOf(image.format),
                                             image.isRowMajor ? SSImageDataLayout_RowMajorInterleaved
@@ -273,7 +286,8 @@ Layout TypeLoader::layout(const Description& description) const {
         } else {
             const char* const kind = std::holds_alternative<StringDescription>(type.kind)   ? "string"
                                      : std::holds_alternative<MatrixDescription>(type.kind) ? "matrix"
-                                                                                            : "image";
+                                     : std::holds_alternative<ImageDescription>(type.kind)  ? "image"
+                                                                                            : "date-time";
             layout.otherTypes.push_back(otherType(type.name, kind));
             const int id = table_.getDataTypeId(type.name.c_str());
             const std::string target = DtGetDataTypeName(&table_, DtGetDataTypeIdAliasedThruTo(&table_, id));
