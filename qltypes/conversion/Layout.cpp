@@ -71,7 +71,7 @@ class Conversion {
   public:
     Conversion(const Cell& cell, const Vectors& vectors, bool check)
         : cell_(cell), vectors_(vectors), run_(levelInUse->convert[cell.slot]),
-          survive_(check ? levelInUse->survive[cell.srcId][cell.dstId] : nullptr),
+          convertWhileKept_(check ? levelInUse->convertWhileKept[cell.srcId][cell.dstId] : nullptr),
           pastCaches_(vectors.src != vectors.dst && writtenBytes() > cachedBytes) {}
 
     bool run() {
@@ -94,13 +94,23 @@ class Conversion {
     bool dstComplex() const { return vectors_.dstComplex && !cell_.joinsParts; }
     std::size_t writtenBytes() const { return (vectors_.dstCount * cell_.dstSize) << dstComplex(); }
 
-    // Notes whether `count` source elements at `src` survive; the first loss settles it.
-    void test(const std::byte* src, std::size_t count) {
-        if (survive_ && kept_) kept_ = survive_(src, count);
+    // Converts a run and notes whether something was lost; the first loss settles it.
+    void convertRun(const std::byte* src, std::byte* dst, std::size_t count) {
+        if (convertWhileKept_ && kept_) {
+            const std::size_t done = convertWhileKept_(src, dst, count);
+            if (done == count) return;
+            kept_ = false;
+            src += done * cell_.srcSize;
+            dst += done * cell_.dstSize;
+            count -= done;
+        }
+        run_(src, dst, count);
     }
 
+    // Dropping an imaginary part that is not zero is a loss.
     void testImaginary(const std::byte* pairs, std::size_t count) {
-        if (survive_ && kept_) kept_ = !pairsOfSize(cell_.srcSize).anyImaginary(pairs, count, cell_.hasSignedZero);
+        if (convertWhileKept_ && kept_)
+            kept_ = !pairsOfSize(cell_.srcSize).anyImaginary(pairs, count, cell_.hasSignedZero);
     }
 
     // Has `write` make the next `bytes` of the destination, there or in a block that then goes past the caches.
@@ -125,10 +135,9 @@ class Conversion {
         const std::byte* src = vectors_.src;
         std::byte* dst = vectors_.dst;
         const std::size_t all = vectors_.dstCount << vectors_.srcComplex * !cell_.joinsParts;
-        if (!survive_ && (!pastCaches_ || cell_.copiesBytes)) return run_(src, dst, all);
+        if (!pastCaches_ || cell_.copiesBytes) return convertRun(src, dst, all);
         inBlocks(all, blockElements, [&](std::size_t count) {
-            test(src, count);
-            emit(dst, count * cell_.dstSize, [&](std::byte* to) { run_(src, to, count); });
+            emit(dst, count * cell_.dstSize, [&](std::byte* to) { convertRun(src, to, count); });
             src += count * cell_.srcSize;
         });
     }
@@ -137,8 +146,7 @@ class Conversion {
         const std::byte* src = vectors_.src;
         std::byte* dst = vectors_.dst;
         inBlocks(vectors_.dstCount, blockElements / 2, [&](std::size_t count) {
-            test(src, count);
-            run_(src, parts_.bytes, count);
+            convertRun(src, parts_.bytes, count);
             emit(dst, 2 * count * cell_.dstSize,
                  [&](std::byte* to) { pairsOfSize(cell_.dstSize).addZeroParts(parts_.bytes, to, count); });
             src += count * cell_.srcSize;
@@ -151,8 +159,7 @@ class Conversion {
         inBlocks(vectors_.dstCount, blockElements / 2, [&](std::size_t count) {
             testImaginary(src, count);
             pairsOfSize(cell_.srcSize).takeRealParts(src, parts_.bytes, count);
-            test(parts_.bytes, count);
-            emit(dst, count * cell_.dstSize, [&](std::byte* to) { run_(parts_.bytes, to, count); });
+            emit(dst, count * cell_.dstSize, [&](std::byte* to) { convertRun(parts_.bytes, to, count); });
             src += 2 * count * cell_.srcSize;
         });
     }
@@ -163,9 +170,9 @@ class Conversion {
         std::byte* dst = vectors_.dst;
         inBlocks(vectors_.dstCount, blockElements / 2, [&](std::size_t count) {
             testImaginary(src, count);
-            if (survive_ && kept_) {
+            if (convertWhileKept_ && kept_) {
                 pairsOfSize(cell_.srcSize).takeRealParts(src, parts_.bytes, count);
-                test(parts_.bytes, count);
+                kept_ = convertWhileKept_(parts_.bytes, outgoing_.bytes, count) == count;
             }
             run_(src, parts_.bytes, 2 * count);
             emit(dst, count, [&](std::byte* to) {
@@ -182,7 +189,7 @@ class Conversion {
         one.dst = parts_.bytes;
         one.srcCount = 2; // steps, for the one element there is
         one.dstCount = 1;
-        kept_ = convertInLayout(cell_, one, survive_ != nullptr);
+        kept_ = convertInLayout(cell_, one, convertWhileKept_ != nullptr);
 
         const std::size_t element = cell_.dstSize << dstComplex();
         const std::size_t all = vectors_.dstCount * element;
@@ -203,7 +210,7 @@ class Conversion {
     const Cell& cell_;
     const Vectors& vectors_;
     ConvertRun run_;
-    TestRun survive_; // null: nothing to check
+    KeepingRun convertWhileKept_; // null: nothing to check
     bool pastCaches_;
     bool kept_ = true;
     Block parts_;

@@ -108,6 +108,13 @@ inline __m128i lowBits(__m256d v) {
     return _mm256_castsi256_si128(_mm256_permutevar8x32_epi32(bitsOf(v + all(0x1.8p52)), evenFirst));
 }
 
+// r(v) below 2^32, the half from 2^31 on by what is above that.
+template <fxpModeRounding_tag rounding> __m256i uint32ByHalves(__m256 v) {
+    const __m256 isUpper = lanesWhere<_CMP_GE_OQ>(v, all(0x1p31F));
+    const __m256i withinHalf = toInt32(rounded<float, rounding>(v - both(isUpper, all(0x1p31F))));
+    return withinHalf ^ _mm256_slli_epi32(bitsOf(isUpper), 31);
+}
+
 // The low bytes of integers of `from` bytes.
 template <int from, int to> __m128i cut(__m128i v) {
     if constexpr (to == 4)
@@ -184,10 +191,7 @@ template <class D, fxpModeRounding_tag rounding, class F> auto saturated(F, auto
         return toInt32(rounded<F, rounding>(numbersOnly(v))) ^ bitsOf(tooHigh);
     } else {
         const auto notLow = most(v, all(0.0F));
-        const auto upperHalf = lanesWhere<_CMP_GE_OQ>(notLow, all(0x1p31F));
-        const auto fromHalf = rounded<F, rounding>(notLow - both(upperHalf, all(0x1p31F)));
-        const __m256i number = toInt32(fromHalf) ^ _mm256_slli_epi32(bitsOf(upperHalf), 31);
-        return number | bitsOf(lanesWhere<_CMP_GE_OQ>(notLow, all(hi)));
+        return uint32ByHalves<rounding>(notLow) | bitsOf(lanesWhere<_CMP_GE_OQ>(notLow, all(hi)));
     }
 }
 
@@ -251,6 +255,9 @@ template <class S, class D, fxpModeOverflow_tag overflow> auto toInteger(auto v)
     }
 }
 
+// Elements of D back as bits of numbers of type F.
+template <class D, class F> __m256i back(F, auto d) { return toFloating<D, F>(d); }
+
 struct Avx2 {
     static constexpr std::size_t registerBytes = 32;
     using Bits = __m256i;
@@ -288,17 +295,18 @@ struct Avx2 {
             return wrapped<D, rounding>(S{}, conversion::floating(S{}, v));
     }
 
-    // Tests of a register: lanes of ones, or the bits that differ.
-    static auto floating(auto f, __m256i bits) { return conversion::floating(f, bits); }
-    static __m256d magnitude(__m256d v) { return _mm256_andnot_pd(all(-0.0), v); }
-    template <int relation> static __m256i lanesWhere(auto v, auto bound) {
-        return bitsOf(conversion::lanesWhere<relation>(v, all(bound)));
+    template <class F, class D> static auto truncated(auto v) {
+        if constexpr (isFloating<D>)
+            return _mm_castps_si128(_mm256_cvtpd_ps(v));
+        else if constexpr (!std::is_same_v<D, std::uint32_t>)
+            return cut<4, sizeof(D)>(toInt32(v));
+        else if constexpr (std::is_same_v<F, double>)
+            return lowBits(integral<towardZero>(v));
+        else
+            return uint32ByHalves<FXP_ROUND_ZERO>(v);
     }
-    static __m256i unlikeTruncated(auto v, auto lo, auto hi) {
-        return bitsOf(conversion::lanesWhere<_CMP_NEQ_UQ>(v, integral<towardZero>(least(all(hi), most(all(lo), v)))));
-    }
-    static __m256i unlikeSingle(__m256d v) {
-        return bitsOf(conversion::lanesWhere<_CMP_NEQ_UQ>(v, _mm256_cvtps_pd(_mm256_cvtpd_ps(v))));
+    template <class F, class D> static __m256i unlike(auto v, auto d) {
+        return bitsOf(conversion::lanesWhere<_CMP_NEQ_UQ>(v, conversion::floating(F{}, back<D>(F{}, d))));
     }
     template <class S> static __m256i unlikeSingle(S, __m256i v) {
         // 2^31, next to the highest, comes back as the lowest. From 2^31 on a single has all bits but the lowest eight.
@@ -310,13 +318,25 @@ struct Avx2 {
                                                         _mm256_castsi256_ps(v & _mm256_set1_epi32(0xff)),
                                                         _mm256_castsi256_ps(v)));
     }
+
+    static auto floating(auto f, __m256i bits) { return conversion::floating(f, bits); }
+    static __m256d magnitude(__m256d v) { return _mm256_andnot_pd(all(-0.0), v); }
+    template <int relation> static __m256i lanesWhere(auto v, auto bound) {
+        return bitsOf(conversion::lanesWhere<relation>(v, all(bound)));
+    }
+    static bool any(__m256i mask) { return !_mm256_testz_si256(mask, mask); }
     template <int size> static __m256i signs(__m256i v) {
         return size == 4 ? _mm256_srai_epi32(v, 31) : _mm256_srai_epi16(v, 15);
     }
     template <int size> static bool anyBit(__m256i v, std::uint32_t bits) {
         return !_mm256_testz_si256(v, allLanes<size>(bits));
     }
-    static bool any(__m256i mask) { return !_mm256_testz_si256(mask, mask); }
+    static __m256i doubled32(__m256i v) { return _mm256_add_epi32(v, v); }
+    static __m256i most32(__m256i v, __m256i w) { return _mm256_max_epu32(v, w); }
+    static bool anyFrom32(__m256i v, std::uint32_t low, std::uint32_t high) {
+        const __m256i bounds = _mm256_set1_epi64x(static_cast<long long>(std::uint64_t{high} << 32 | low));
+        return any(_mm256_cmpeq_epi32(most32(v, bounds), v));
+    }
 
     // Whole registers past the caches; what is left at either end as usual.
     static void copyToMemory(const std::byte* src, std::byte* dst, std::size_t bytes) {

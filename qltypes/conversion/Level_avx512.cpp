@@ -74,50 +74,51 @@ template <int direction> __m512 remainder(__m512 v, float modulus) {
     return _mm512_fnmadd_ps(_mm512_roundscale_ps(_mm512_mul_ps(v, all(1 / modulus)), direction), all(modulus), v);
 }
 
-inline __m512d integral(__m512d v) { return _mm512_roundscale_pd(v, towardZero); }
-inline __m512 integral(__m512 v) { return _mm512_roundscale_ps(v, towardZero); }
-
-template <int direction> __m256i toInt32(__m512d v) { return _mm512_cvt_roundpd_epi32(v, direction); }
-template <int direction> __m512i toInt32(__m512 v) { return _mm512_cvt_roundps_epi32(v, direction); }
-template <int direction> __m256i toUint32(__m512d v) { return _mm512_cvt_roundpd_epu32(v, direction); }
-template <int direction> __m512i toUint32(__m512 v) { return _mm512_cvt_roundps_epu32(v, direction); }
 template <int direction> __m512i toInt64(__m512d v) { return _mm512_cvt_roundpd_epi64(v, direction); }
+template <int direction> __m512i toUint64(__m512d v) { return _mm512_cvt_roundpd_epu64(v, direction); }
+template <int direction> __m512i toInt32(__m512 v) { return _mm512_cvt_roundps_epi32(v, direction); }
+template <int direction> __m512i toUint32(__m512 v) { return _mm512_cvt_roundps_epu32(v, direction); }
 
-// The same where v is a number, and 0 for NaN.
-template <int direction> __m256i numberToInt32(__m512d v) {
-    return _mm512_maskz_cvt_roundpd_epi32(lanesWhere<_CMP_ORD_Q>(v, v), v, direction);
+// To integers of the element's own size. The last gives 0 where `from` is NaN.
+template <int direction> __m512i toSigned(__m512d v) { return toInt64<direction>(v); }
+template <int direction> __m512i toSigned(__m512 v) { return toInt32<direction>(v); }
+template <int direction> __m512i toUnsigned(__m512d v) { return toUint64<direction>(v); }
+template <int direction> __m512i toUnsigned(__m512 v) { return toUint32<direction>(v); }
+template <int direction> __m512i maskedToSigned(__m512d from, __m512d v) {
+    return _mm512_maskz_cvt_roundpd_epi64(lanesWhere<_CMP_ORD_Q>(from, from), v, direction);
 }
-template <int direction> __m512i numberToInt32(__m512 v) {
-    return _mm512_maskz_cvt_roundps_epi32(lanesWhere<_CMP_ORD_Q>(v, v), v, direction);
+template <int direction> __m512i maskedToSigned(__m512 from, __m512 v) {
+    return _mm512_maskz_cvt_roundps_epi32(lanesWhere<_CMP_ORD_Q>(from, from), v, direction);
 }
 
 // clang-format off
 // Integers of `from` bytes to narrower ones: cut off, or saturating in the signed or unsigned range.
-template <int from, int to> auto cut(auto v) {
-    constexpr bool full = sizeof v == 64;
-    if constexpr (from == to)              return v;
+template <int from, int to> auto cut(__m512i v) {
+    if constexpr (from == to)                return v;
     else if constexpr (from == 8 && to == 4) return _mm512_cvtepi64_epi32(v);
     else if constexpr (from == 8 && to == 2) return _mm512_cvtepi64_epi16(v);
-    else if constexpr (from == 8 && to == 1) return _mm512_cvtepi64_epi8(v);
-    else if constexpr (from == 2)            return _mm512_cvtepi16_epi8(v);
-    else if constexpr (to == 2 && full)      return _mm512_cvtepi32_epi16(v);
-    else if constexpr (to == 2)              return _mm256_cvtepi32_epi16(v);
-    else if constexpr (full)                 return _mm512_cvtepi32_epi8(v);
-    else                                     return _mm256_cvtepi32_epi8(v);
+    else if constexpr (from == 8)            return _mm512_cvtepi64_epi8(v);
+    else if constexpr (from == 4 && to == 2) return _mm512_cvtepi32_epi16(v);
+    else if constexpr (from == 4)            return _mm512_cvtepi32_epi8(v);
+    else                                     return _mm512_cvtepi16_epi8(v);
 }
 template <int from, int to> auto saturatedSigned(__m512i v) {
-    if constexpr (from == 2)      return _mm512_cvtsepi16_epi8(v);
-    else if constexpr (to == 2)   return _mm512_cvtsepi32_epi16(v);
-    else                          return _mm512_cvtsepi32_epi8(v);
+    if constexpr (from == to)                return v;
+    else if constexpr (from == 8 && to == 4) return _mm512_cvtsepi64_epi32(v);
+    else if constexpr (from == 8 && to == 2) return _mm512_cvtsepi64_epi16(v);
+    else if constexpr (from == 8)            return _mm512_cvtsepi64_epi8(v);
+    else if constexpr (from == 4 && to == 2) return _mm512_cvtsepi32_epi16(v);
+    else if constexpr (from == 4)            return _mm512_cvtsepi32_epi8(v);
+    else                                     return _mm512_cvtsepi16_epi8(v);
 }
-template <int from, int to> auto saturatedUnsigned(auto v) {
-    constexpr bool full = sizeof v == 64;
-    if constexpr (from == to)              return v;
-    else if constexpr (from == 2)            return _mm512_cvtusepi16_epi8(v);
-    else if constexpr (to == 2 && full)      return _mm512_cvtusepi32_epi16(v);
-    else if constexpr (to == 2)              return _mm256_cvtusepi32_epi16(v);
-    else if constexpr (full)                 return _mm512_cvtusepi32_epi8(v);
-    else                                     return _mm256_cvtusepi32_epi8(v);
+template <int from, int to> auto saturatedUnsigned(__m512i v) {
+    if constexpr (from == to)                return v;
+    else if constexpr (from == 8 && to == 4) return _mm512_cvtusepi64_epi32(v);
+    else if constexpr (from == 8 && to == 2) return _mm512_cvtusepi64_epi16(v);
+    else if constexpr (from == 8)            return _mm512_cvtusepi64_epi8(v);
+    else if constexpr (from == 4 && to == 2) return _mm512_cvtusepi32_epi16(v);
+    else if constexpr (from == 4)            return _mm512_cvtusepi32_epi8(v);
+    else                                     return _mm512_cvtusepi16_epi8(v);
 }
 
 // Elements of an integer type to integers of `to` bytes, eight of them or a full register.
@@ -152,19 +153,18 @@ template <int size> __m512i leastUnsigned(__m512i a, __m512i b) {
 
 template <class D, fxpModeRounding_tag rounding, class F> auto saturated(F, auto v) {
     constexpr int direction = directionOf<rounding>;
-    constexpr F hi = static_cast<F>(highest<D>), lo = static_cast<F>(lowest<D>);
     if constexpr (std::is_unsigned_v<D>) {
-        // NaN becomes 0 with the negative values; what is beyond 32 bits becomes the highest.
+        // NaN becomes 0 with the negative values.
         const auto atLeastZero = withHalf<F, rounding>(most(v, all(F(0))));
-        return saturatedUnsigned<4, sizeof(D)>(toUint32<direction>(atLeastZero));
-    } else if constexpr (sizeof(D) < 4) {
-        return cut<4, sizeof(D)>(toInt32<direction>(withHalf<F, rounding>(least(all(hi), most(all(lo), v)))));
-    } else if constexpr (std::is_same_v<F, double>) {
-        // What is too low becomes the lowest.
-        return numberToInt32<direction>(withHalf<F, rounding>(least(all(hi), v)));
+        return saturatedUnsigned<sizeof(F), sizeof(D)>(toUnsigned<direction>(atLeastZero));
+    } else if constexpr (sizeof(D) < sizeof(F)) {
+        // Far beyond the range, but not beyond what converts.
+        constexpr F farAbove = static_cast<F>(std::uint64_t{1} << (sizeof(F) * 8 - 2));
+        const auto atMostFar = withHalf<F, rounding>(least(v, all(farAbove)));
+        return saturatedSigned<sizeof(F), sizeof(D)>(maskedToSigned<direction>(v, atMostFar));
     } else {
-        // hi is 2^31 here, beyond what converts.
-        const __m512i number = numberToInt32<direction>(withHalf<F, rounding>(v));
+        constexpr F hi = static_cast<F>(highest<D>); // 2^31, beyond what converts
+        const __m512i number = maskedToSigned<direction>(v, withHalf<F, rounding>(v));
         return _mm512_mask_mov_epi32(number, lanesWhere<_CMP_GE_OQ>(v, all(hi)), allLanes<4>(highest<D>));
     }
 }
@@ -172,18 +172,16 @@ template <class D, fxpModeRounding_tag rounding, class F> auto saturated(F, auto
 template <class D, fxpModeRounding_tag rounding, class F> auto wrapped(F, auto v) {
     constexpr int direction = directionOf<rounding>;
     constexpr F modulusOfD = static_cast<F>(modulus<D>);
-    if constexpr (std::is_same_v<F, double>) {
-        // Beyond 64 bits the low byte of every double is zero.
-        if constexpr (sizeof(D) > 1) v = remainder<towardZero>(v, modulusOfD);
-        return cut<8, sizeof(D)>(toInt64<direction>(withHalf<F, rounding>(v)));
-    } else if constexpr (sizeof(D) == 4) {
+    if constexpr (sizeof(D) == sizeof(F)) {
         // Values with a fraction stay as they are; 2^31 gives the bits that it should.
-        v = remainder<toNearest>(v, modulusOfD);
-        return numberToInt32<direction>(withHalf<F, rounding>(v));
+        const auto rest = remainder<toNearest>(v, modulusOfD);
+        return maskedToSigned<direction>(rest, withHalf<F, rounding>(rest));
+    } else if constexpr (sizeof(D) > 1) {
+        const auto rest = remainder<towardZero>(v, modulusOfD);
+        return cut<sizeof(F), sizeof(D)>(toSigned<direction>(withHalf<F, rounding>(rest)));
     } else {
-        // Beyond 32 bits the low byte of every single is zero.
-        if constexpr (sizeof(D) > 1) v = remainder<towardZero>(v, modulusOfD);
-        return cut<4, sizeof(D)>(toInt32<direction>(withHalf<F, rounding>(v)));
+        // What is beyond the conversion has a low byte of zero.
+        return cut<sizeof(F), 1>(toSigned<direction>(withHalf<F, rounding>(v)));
     }
 }
 
@@ -231,9 +229,20 @@ template <class S, class D, fxpModeOverflow_tag overflow> auto toInteger(auto v)
     }
 }
 
+// Elements of D back as numbers of type F; singles toward zero, so that no end of a range comes back as a power of two.
+template <class D> __m512d back(double, auto d) { return _mm512_castsi512_pd(toFloating<D, double>(d)); }
+template <class D> __m512 back(float, auto d) {
+    const __m512i wide = widened<D, 4, 16>(d);
+    return std::is_unsigned_v<D> ? _mm512_cvt_roundepu32_ps(wide, towardZero)
+                                 : _mm512_cvt_roundepi32_ps(wide, towardZero);
+}
+
 struct Avx512 {
     static constexpr std::size_t registerBytes = 64;
     using Bits = __m512i;
+
+    // 1 to 64 of them.
+    static __mmask64 firstBytes(std::size_t count) { return ~__mmask64{0} >> (64 - count); }
 
     // clang-format off
     template <std::size_t bytes> static auto load(const std::byte* p) {
@@ -243,7 +252,7 @@ struct Avx512 {
         else                            return _mm_loadu_si64(p);
     }
     template <std::size_t bytes> static auto load(const std::byte* p, std::size_t used) {
-        const __mmask64 mask = (__mmask64{1} << used) - 1;
+        const __mmask64 mask = firstBytes(used);
         if constexpr (bytes == 64)      return _mm512_maskz_loadu_epi8(mask, p);
         else if constexpr (bytes == 32) return _mm256_maskz_loadu_epi8(static_cast<__mmask32>(mask), p);
         else                            return _mm_maskz_loadu_epi8(static_cast<__mmask16>(mask), p);
@@ -255,7 +264,7 @@ struct Avx512 {
         else                            _mm_storeu_si64(p, v);
     }
     template <std::size_t bytes> static void store(std::byte* p, auto v, std::size_t used) {
-        const __mmask64 mask = (__mmask64{1} << used) - 1;
+        const __mmask64 mask = firstBytes(used);
         if constexpr (bytes == 64)      _mm512_mask_storeu_epi8(p, mask, v);
         else if constexpr (bytes == 32) _mm256_mask_storeu_epi8(p, static_cast<__mmask32>(mask), v);
         else                            _mm_mask_storeu_epi8(p, static_cast<__mmask16>(mask), v);
@@ -276,16 +285,16 @@ struct Avx512 {
             return wrapped<D, rounding>(S{}, floating(S{}, v));
     }
 
-    // Tests of a register: lanes as a mask, or the bits that differ.
-    static auto floating(auto f, __m512i bits) { return conversion::floating(f, bits); }
-    template <int relation, class F> static auto lanesWhere(auto v, F bound) {
-        return conversion::lanesWhere<relation>(v, all(bound));
+    template <class F, class D> static auto truncated(auto v) {
+        if constexpr (isFloating<D>)
+            return _mm256_castps_si256(_mm512_cvtpd_ps(v));
+        else if constexpr (std::is_unsigned_v<D>)
+            return saturatedUnsigned<sizeof(F), sizeof(D)>(toUnsigned<towardZero>(v));
+        else
+            return saturatedSigned<sizeof(F), sizeof(D)>(toSigned<towardZero>(v));
     }
-    template <class F> static auto unlikeTruncated(auto v, F lo, F hi) {
-        return conversion::lanesWhere<_CMP_NEQ_UQ>(v, integral(least(all(hi), most(all(lo), v))));
-    }
-    static auto unlikeSingle(__m512d v) {
-        return conversion::lanesWhere<_CMP_NEQ_UQ>(v, _mm512_cvtps_pd(_mm512_cvtpd_ps(v)));
+    template <class F, class D> static auto unlike(auto v, auto d) {
+        return conversion::lanesWhere<_CMP_NEQ_UQ>(v, back<D>(F{}, d));
     }
     template <class S> static __m512i unlikeSingle(S, __m512i v) {
         if constexpr (std::is_signed_v<S>) // 2^31, next to the highest, comes back as the lowest
@@ -293,14 +302,25 @@ struct Avx512 {
         else // rounded toward zero, or 2^32 would come back as the highest
             return v ^ _mm512_cvttps_epu32(_mm512_cvt_roundepu32_ps(v, towardZero));
     }
+
+    static auto floating(auto f, __m512i bits) { return conversion::floating(f, bits); }
+    static __m512d magnitude(__m512d v) { return _mm512_abs_pd(v); }
+    template <int relation> static auto lanesWhere(auto v, auto bound) {
+        return conversion::lanesWhere<relation>(v, all(bound));
+    }
+    static bool any(auto mask) { return mask != 0; }
     template <int size> static __m512i signs(__m512i v) {
         return size == 4 ? _mm512_srai_epi32(v, 31) : _mm512_srai_epi16(v, 15);
     }
     template <int size> static bool anyBit(__m512i v, std::uint32_t bits) {
         return _mm512_test_epi32_mask(v, allLanes<size>(bits)) != 0;
     }
-    static __m512d magnitude(__m512d v) { return _mm512_abs_pd(v); }
-    static bool any(auto mask) { return mask != 0; }
+    static __m512i doubled32(__m512i v) { return _mm512_add_epi32(v, v); }
+    static __m512i most32(__m512i v, __m512i w) { return _mm512_max_epu32(v, w); }
+    static bool anyFrom32(__m512i v, std::uint32_t low, std::uint32_t high) {
+        const auto both = static_cast<long long>(std::uint64_t{high} << 32 | low);
+        return _mm512_cmpge_epu32_mask(v, _mm512_set1_epi64(both)) != 0;
+    }
 
     // Whole lines past the caches; what is left of a line at either end as usual.
     static void copyToMemory(const std::byte* src, std::byte* dst, std::size_t bytes) {

@@ -14,6 +14,10 @@ template <class T> T loadElement(const std::byte* from, std::size_t i) {
     return v;
 }
 
+template <class T> void storeElement(std::byte* to, std::size_t i, T v) {
+    std::memcpy(to + i * sizeof(T), &v, sizeof(T));
+}
+
 struct PortableRuns {
     template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
     static constexpr ConvertRun convertRun() {
@@ -21,23 +25,24 @@ struct PortableRuns {
             if constexpr (copiesBytes<S, D, overflow>) {
                 std::memmove(dst, src, count * sizeof(D));
             } else {
-                for (std::size_t i = 0; i < count; ++i) {
-                    const D v = converted<S, D, rounding, overflow>(loadElement<S>(src, i));
-                    std::memcpy(dst + i * sizeof(D), &v, sizeof(D));
-                }
+                for (std::size_t i = 0; i < count; ++i)
+                    storeElement(dst, i, converted<S, D, rounding, overflow>(loadElement<S>(src, i)));
             }
         };
     }
 
-    template <class S, class D> static constexpr TestRun surviveRun() {
-        return [](const std::byte* src, std::size_t count) {
-            for (std::size_t i = 0; i < count; ++i)
-                if (!survives<S, D>(loadElement<S>(src, i))) return false;
-            return true;
+    template <class S, class D> static constexpr KeepingRun keepingRun() {
+        return [](const std::byte* src, std::byte* dst, std::size_t count) {
+            for (std::size_t i = 0; i < count; ++i) {
+                const S s = loadElement<S>(src, i);
+                if (!survives<S, D>(s)) return i;
+                storeElement(dst, i, converted<S, D, FXP_ROUND_ZERO, FXP_OVERFLOW_WRAP>(s));
+            }
+            return count;
         };
     }
 
-    template <class S, class D, fxpModeRounding_tag rounding> static constexpr TestRun overflowRun() {
+    template <class S, class D, fxpModeRounding_tag rounding> static constexpr OverflowRun overflowRun() {
         return [](const std::byte* src, std::size_t count) {
             for (std::size_t i = 0; i < count; ++i)
                 if (overflows<S, D, rounding>(loadElement<S>(src, i))) return true;

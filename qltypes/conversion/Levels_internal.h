@@ -15,21 +15,25 @@ namespace QLTypeSys::conversion {
 /// Converts `count` elements. `src` and `dst` need no alignment; they may be equal where the element sizes are.
 using ConvertRun = void (*)(const std::byte* src, std::byte* dst, std::size_t count);
 
-/// A claim about a run of source elements.
-using TestRun = bool (*)(const std::byte* src, std::size_t count);
+/// Converts elements as long as each equals what is written for it. Returns how many were converted: all, or the first
+/// ones up to somewhere before the first that is lost. No mode counts for an element that is kept.
+using KeepingRun = std::size_t (*)(const std::byte* src, std::byte* dst, std::size_t count);
+
+/// True when some element leaves the range of the destination.
+using OverflowRun = bool (*)(const std::byte* src, std::size_t count);
 
 struct Level {
     const char* name;
     SlotTable<ConvertRun> convert;
-    PairTable<TestRun> survive;   ///< every element equals what is written for it; null where none can be lost
-    SlotTable<TestRun> overflows; ///< some element leaves the range of the destination; null where none can
+    PairTable<KeepingRun> convertWhileKept; ///< null where nothing can be lost
+    SlotTable<OverflowRun> overflows;       ///< null where nothing can overflow
     /// Copies `bytes` past the caches, for what will not be read soon.
     void (*copyToMemory)(const std::byte* src, std::byte* dst, std::size_t bytes);
     /// Makes those copies visible in the order of all other writes. To be called once after the last of them.
     void (*finishCopies)();
 };
 
-/// The table of a class that makes these with static templates: convertRun<S, D, rounding, overflow>, surviveRun<S, D>,
+/// The table of a class that makes these with static templates: convertRun<S, D, rounding, overflow>, keepingRun<S, D>,
 /// overflowRun<S, D, rounding>; and copyToMemory, finishCopies.
 template <class Runs> constexpr Level levelOf(const char* name) {
     return {
@@ -38,14 +42,14 @@ template <class Runs> constexpr Level levelOf(const char* name) {
             []<class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>() -> ConvertRun {
                 return Runs::template convertRun<S, D, rounding, overflow>();
             }),
-        .survive = pairTable<TestRun>([]<class S, class D>() -> TestRun {
+        .convertWhileKept = pairTable<KeepingRun>([]<class S, class D>() -> KeepingRun {
             if constexpr (holdsEveryValue<S, D>())
                 return nullptr;
             else
-                return Runs::template surviveRun<S, D>();
+                return Runs::template keepingRun<S, D>();
         }),
-        .overflows =
-            slotTable<TestRun>([]<class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag>() -> TestRun {
+        .overflows = slotTable<OverflowRun>(
+            []<class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag>() -> OverflowRun {
                 if constexpr (canOverflow<S, D>)
                     return Runs::template overflowRun<S, D, rounding>();
                 else

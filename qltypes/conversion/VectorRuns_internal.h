@@ -3,22 +3,28 @@
 // `Vectors` is the set of operations of one instruction set. It is a class of an unnamed namespace, so that what is
 // compiled for one processor is never taken for another. It provides, F being double or float:
 //
-//   registerBytes, Bits                               the width of its registers, and one of them
-//   load<bytes>(p), load<bytes>(p, used)              a register of `bytes`; the second reads `used`, the rest is zero
+//   registerBytes, Bits                          the width of its registers, and a whole one of them
+//   load<bytes>(p), load<bytes>(p, used)         a register of `bytes`; the second reads `used`, the rest is zero
 //   store<bytes>(p, v), store<bytes>(p, v, used)
-//   converted<S, D, rounding, overflow>(v)            elements of S to as many elements of D
-//   floating(F{}, bits), magnitude(v)                 a whole register as floating elements
-//   lanesWhere<relation>(v, bound)                    a mask; masks combine with & and |, any(mask) asks
-//   unlikeTruncated(v, lo, hi), unlikeSingle(v)       a mask: not an integer from lo to hi; not a single
-//   unlikeSingle(S{}, bits)                           bits that differ once the integers have been singles
-//   signs<size>(bits), anyBit<size>(bits, some)       lanes filled with their sign; whether a lane has one of some bits
+//   converted<S, D, rounding, overflow>(v)       elements of S to as many elements of D
+//   truncated<F, D>(v)                           right where D has the value, some other value of D elsewhere
+//   unlike<F, D>(v, d)                           mask of the elements that differ from what truncated() made of them
+//   unlikeSingle(S{}, v)                         bits that differ once 32-bit integers have been singles
+//   floating(F{}, v), magnitude(v)               a whole register as floating elements
+//   lanesWhere<relation>(v, bound)               a mask; masks combine with & and |, any(mask) asks
+//   signs<size>(v), anyBit<size>(v, some)        lanes filled with their sign; whether a lane has one of some bits
+//   doubled32(v), most32(v, w)                   of unsigned 32-bit lanes: twice the lane cut off, the larger lanes
+//   anyFrom32(v, low, high)                      whether an even lane is at least `low` or an odd one at least `high`
 //   copyToMemory(src, dst, bytes), finishCopies()     as in Level
 //
 // The bits of a register that stand for no element of a run are zero, which is lost nowhere and overflows nothing.
 #pragma once
 
+#include <algorithm>
+#include <bit>
 #include <concepts>
 #include <cstddef>
+#include <cstdint>
 #include <cstring>
 #include <type_traits>
 #include <utility>
@@ -73,30 +79,14 @@ template <class Vectors, class S> class IntegersUnlikeSingles {
     typename Vectors::Bits differences_{};
 };
 
-/// Floating elements for which a rule gives a mask.
-template <class Vectors, class F, class Rule> class FloatingLanes {
+/// Floating elements beyond the bounds of the overflow test.
+template <class Vectors, class F, class D, fxpModeRounding_tag rounding> class FloatingOutside {
   public:
-    void note(typename Vectors::Bits v) { found_ |= Rule::lanes(Vectors::floating(F{}, v)); }
+    void note(typename Vectors::Bits v) { found_ |= outside(Vectors::floating(F{}, v)); }
     bool any() const { return Vectors::any(found_); }
 
   private:
-    decltype(Rule::lanes(Vectors::floating(F{}, typename Vectors::Bits{}))) found_{};
-};
-
-template <class Vectors, class F, class D> struct LossRule {
-    static auto lanes(auto v) {
-        if constexpr (isBoolean<D>)
-            return Vectors::template lanesWhere<_CMP_NEQ_UQ>(v, F(0)) &
-                   Vectors::template lanesWhere<_CMP_NEQ_UQ>(v, F(1));
-        else if constexpr (isFloating<D>)
-            return Vectors::unlikeSingle(v);
-        else
-            return Vectors::unlikeTruncated(v, static_cast<F>(lowest<D>), highestIn<F, D>);
-    }
-};
-
-template <class Vectors, class F, class D, fxpModeRounding_tag rounding> struct OverflowRule {
-    static auto lanes(auto v) {
+    static auto outside(auto v) {
         if constexpr (isFloating<D>) {
             const auto magnitude = Vectors::magnitude(v);
             return Vectors::template lanesWhere<_CMP_GE_OQ>(magnitude, infiniteAsSingleFrom) &
@@ -109,12 +99,97 @@ template <class Vectors, class F, class D, fxpModeRounding_tag rounding> struct 
                    Vectors::template lanesWhere<belowRelation>(v, bounds.below);
         }
     }
+
+    decltype(outside(Vectors::floating(F{}, typename Vectors::Bits{}))) found_{};
+};
+
+/// A quick look before FloatingOutside, on the bits as unsigned numbers: toward an unsigned type everything is inside
+/// that is not negative and below the upper bound, toward a signed one everything whose magnitude is below both. Of a
+/// double the upper half is looked at. What any() denies is inside; what it affirms, NaN among it, may be so too.
+template <class Vectors, class F, class D, fxpModeRounding_tag rounding> class PerhapsOutside {
+  public:
+    void note(typename Vectors::Bits v) {
+        if constexpr (isSigned)
+            most_ = Vectors::most32(most_, Vectors::doubled32(v));
+        else
+            most_ = Vectors::most32(most_, v);
+    }
+    bool any() const {
+        return Vectors::anyFrom32(most_, std::is_same_v<F, double> ? ~std::uint32_t{0} : threshold, threshold);
+    }
+
+  private:
+    static constexpr bool isSigned = !std::is_unsigned_v<D>;
+    static constexpr F bound() {
+        if constexpr (isFloating<D>) {
+            return infiniteAsSingleFrom;
+        } else {
+            constexpr OverflowBounds<F> bounds = overflowBounds<F, D, rounding>();
+            return isSigned && -bounds.below < bounds.above ? -bounds.below : bounds.above;
+        }
+    }
+    static constexpr std::uint32_t upperHalf(double v) {
+        return static_cast<std::uint32_t>(std::bit_cast<std::uint64_t>(v) >> 32);
+    }
+    static constexpr std::uint32_t upperHalf(float v) { return std::bit_cast<std::uint32_t>(v); }
+    static constexpr std::uint32_t threshold = upperHalf(bound()) << isSigned;
+
+    typename Vectors::Bits most_{};
+};
+
+/// Converts registers and notes whether an element is lost.
+template <class Vectors, class S, class D> class KeepingConversion {
+  public:
+    auto convert(auto v) {
+        if constexpr (isFloating<S> && isBoolean<D>) {
+            const auto number = Vectors::floating(S{}, v);
+            lost_ |= Vectors::template lanesWhere<_CMP_NEQ_UQ>(number, S(0)) &
+                     Vectors::template lanesWhere<_CMP_NEQ_UQ>(number, S(1));
+            return Vectors::template converted<S, D, FXP_ROUND_ZERO, FXP_OVERFLOW_WRAP>(v);
+        } else if constexpr (isFloating<S>) {
+            const auto number = Vectors::floating(S{}, v);
+            const auto result = Vectors::template truncated<S, D>(number);
+            lost_ |= Vectors::template unlike<S, D>(number, result);
+            return result;
+        } else {
+            using Bits = SameBits<S, D, FXP_OVERFLOW_WRAP>;
+            const auto result =
+                Vectors::template converted<typename Bits::Src, typename Bits::Dst, FXP_ROUND_ZERO, FXP_OVERFLOW_WRAP>(
+                    v);
+            if constexpr (sizeof(D) > sizeof(S))
+                notes_.note(result);
+            else
+                notes_.note(v);
+            return result;
+        }
+    }
+    bool anyLost() const {
+        if constexpr (isFloating<S>)
+            return Vectors::any(lost_);
+        else
+            return notes_.any();
+    }
+
+  private:
+    struct Nothing {};
+    // Integers are looked at as they are, or where they are widened afterwards: only negative ones are lost there.
+    template <class T>
+    using Integers =
+        std::conditional_t<isFloating<D>, IntegersUnlikeSingles<Vectors, T>, IntegersOutside<Vectors, T, D>>;
+    template <class T> struct NotesOf { using type = Integers<T>; };
+    template <class T>
+    requires(std::is_signed_v<T> && sizeof(D) > sizeof(T)) struct NotesOf<T> {
+        using type = IntegersOutside<Vectors, std::make_signed_t<D>, D>;
+    };
+    template <std::floating_point T> struct NotesOf<T> { using type = Nothing; };
+
+    using Number = std::conditional_t<isFloating<S>, S, double>;
+    decltype(Vectors::template lanesWhere<_CMP_NEQ_UQ>(Vectors::floating(Number{}, typename Vectors::Bits{}),
+                                                       Number{})) lost_{};
+    typename NotesOf<S>::type notes_;
 };
 
 template <class Vectors> struct VectorRuns {
-    /// Registers that are handled between two tests of the loop's end.
-    static constexpr std::size_t unrolled = 4;
-
     template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
     static constexpr ConvertRun convertRun() {
         using Bits = SameBits<S, D, overflow>;
@@ -124,12 +199,13 @@ template <class Vectors> struct VectorRuns {
             return &convertRegisters<typename Bits::Src, typename Bits::Dst, rounding, overflow>;
     }
 
-    template <class S, class D> static constexpr TestRun surviveRun() {
-        return [](const std::byte* src, std::size_t count) { return !anyNoted<Losses<S, D>, S>(src, count); };
-    }
+    template <class S, class D> static constexpr KeepingRun keepingRun() { return &convertWhileKept<S, D>; }
 
-    template <class S, class D, fxpModeRounding_tag rounding> static constexpr TestRun overflowRun() {
-        return &anyNoted<Overflows<S, D, rounding>, S>;
+    template <class S, class D, fxpModeRounding_tag rounding> static constexpr OverflowRun overflowRun() {
+        if constexpr (isFloating<S>)
+            return &anyOutside<FloatingOutside<Vectors, S, D, rounding>, PerhapsOutside<Vectors, S, D, rounding>, S>;
+        else
+            return &anyOutside<IntegersOutside<Vectors, S, D>, IntegersOutside<Vectors, S, D>, S>;
     }
 
     static void copyToMemory(const std::byte* src, std::byte* dst, std::size_t bytes) {
@@ -138,37 +214,35 @@ template <class Vectors> struct VectorRuns {
     static void finishCopies() { Vectors::finishCopies(); }
 
   private:
-    template <class S, class D>
-    using LossesOfIntegers =
-        std::conditional_t<isFloating<D>, IntegersUnlikeSingles<Vectors, S>, IntegersOutside<Vectors, S, D>>;
-    template <class S, class D>
-    using Losses =
-        std::conditional_t<isFloating<S>, FloatingLanes<Vectors, S, LossRule<Vectors, S, D>>, LossesOfIntegers<S, D>>;
-    template <class S, class D, fxpModeRounding_tag rounding>
-    using Overflows =
-        std::conditional_t<isFloating<S>, FloatingLanes<Vectors, S, OverflowRule<Vectors, S, D, rounding>>,
-                           IntegersOutside<Vectors, S, D>>;
-
     template <std::size_t size> static void copyRun(const std::byte* src, std::byte* dst, std::size_t count) {
         std::memmove(dst, src, count * size);
     }
 
+    // The registers of a pair: as many elements as fill one on the wider side.
+    template <class S, class D>
+    static constexpr std::size_t lanes = Vectors::registerBytes / std::max(sizeof(S), sizeof(D));
+
+    // Calls step(k) for k from 0 to `times` - 1, written one after the other.
+    template <std::size_t times> static void repeat(auto step) {
+        [&]<std::size_t... k>(std::index_sequence<k...>) { (step(k), ...); }
+        (std::make_index_sequence<times>());
+    }
+
     template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
     static void convertRegisters(const std::byte* src, std::byte* dst, std::size_t count) {
-        constexpr std::size_t lanes = Vectors::registerBytes / (sizeof(S) > sizeof(D) ? sizeof(S) : sizeof(D));
-        constexpr std::size_t srcBytes = lanes * sizeof(S), dstBytes = lanes * sizeof(D);
+        constexpr std::size_t perRegister = lanes<S, D>, unrolled = 4;
+        constexpr std::size_t srcBytes = perRegister * sizeof(S), dstBytes = perRegister * sizeof(D);
         const auto convertRegister = [&](std::size_t k) {
             const auto loaded = Vectors::template load<srcBytes>(src + k * srcBytes);
             Vectors::template store<dstBytes>(dst + k * dstBytes,
                                               Vectors::template converted<S, D, rounding, overflow>(loaded));
         };
-        for (; count >= unrolled * lanes; count -= unrolled * lanes) {
-            [&]<std::size_t... k>(std::index_sequence<k...>) { (convertRegister(k), ...); }
-            (std::make_index_sequence<unrolled>());
+        for (; count >= unrolled * perRegister; count -= unrolled * perRegister) {
+            repeat<unrolled>(convertRegister);
             src += unrolled * srcBytes;
             dst += unrolled * dstBytes;
         }
-        for (; count >= lanes; count -= lanes) {
+        for (; count >= perRegister; count -= perRegister) {
             convertRegister(0);
             src += srcBytes;
             dst += dstBytes;
@@ -180,20 +254,50 @@ template <class Vectors> struct VectorRuns {
         }
     }
 
-    // Notes whole registers and asks once for several; stops at the first yes.
-    template <class Notes, class S> static bool anyNoted(const std::byte* src, std::size_t count) {
-        constexpr std::size_t bytes = Vectors::registerBytes;
+    // Nothing is written before all of its step is known to be kept: the source may be the destination.
+    template <class S, class D>
+    static std::size_t convertWhileKept(const std::byte* src, std::byte* dst, std::size_t count) {
+        constexpr std::size_t perRegister = lanes<S, D>, unrolled = 4;
+        constexpr std::size_t srcBytes = perRegister * sizeof(S), dstBytes = perRegister * sizeof(D);
+        std::size_t left = count;
+        for (; left >= unrolled * perRegister; left -= unrolled * perRegister) {
+            KeepingConversion<Vectors, S, D> conversion;
+            decltype(conversion.convert(Vectors::template load<srcBytes>(src))) results[unrolled];
+            repeat<unrolled>([&](std::size_t k) {
+                results[k] = conversion.convert(Vectors::template load<srcBytes>(src + k * srcBytes));
+            });
+            if (conversion.anyLost()) return count - left;
+            repeat<unrolled>([&](std::size_t k) { Vectors::template store<dstBytes>(dst + k * dstBytes, results[k]); });
+            src += unrolled * srcBytes;
+            dst += unrolled * dstBytes;
+        }
+        while (left) {
+            const std::size_t some = left < perRegister ? left : perRegister;
+            KeepingConversion<Vectors, S, D> conversion;
+            const auto result = conversion.convert(Vectors::template load<srcBytes>(src, some * sizeof(S)));
+            if (conversion.anyLost()) return count - left;
+            Vectors::template store<dstBytes>(dst, result, some * sizeof(D));
+            src += some * sizeof(S);
+            dst += some * sizeof(D);
+            left -= some;
+        }
+        return count;
+    }
+
+    // Looks quickly at several registers at once, and thoroughly where that finds something.
+    template <class Outside, class Perhaps, class S> static bool anyOutside(const std::byte* src, std::size_t count) {
+        constexpr std::size_t bytes = Vectors::registerBytes, unrolled = 8;
+        const auto noted = [&]<std::size_t times>(auto notes, std::integral_constant<std::size_t, times>) {
+            repeat<times>([&](std::size_t k) { notes.note(Vectors::template load<bytes>(src + k * bytes)); });
+            return notes.any();
+        };
+        constexpr std::integral_constant<std::size_t, unrolled> several;
         std::size_t left = count * sizeof(S);
         for (; left >= unrolled * bytes; left -= unrolled * bytes) {
-            Notes notes;
-            [&]<std::size_t... k>(std::index_sequence<k...>) {
-                (notes.note(Vectors::template load<bytes>(src + k * bytes)), ...);
-            }
-            (std::make_index_sequence<unrolled>());
-            if (notes.any()) return true;
+            if (noted(Perhaps(), several) && noted(Outside(), several)) return true;
             src += unrolled * bytes;
         }
-        Notes notes;
+        Outside notes;
         for (; left >= bytes; left -= bytes) {
             notes.note(Vectors::template load<bytes>(src));
             src += bytes;
