@@ -255,8 +255,37 @@ template <class S, class D, fxpModeOverflow_tag overflow> auto toInteger(auto v)
     }
 }
 
-// Elements of D back as bits of numbers of type F.
-template <class D, class F> __m256i back(F, auto d) { return toFloating<D, F>(d); }
+// Losses of floating elements: the result taken back differs. What is out of range never comes back as it was.
+template <class F, class D> class LossesBackAndForth {
+  public:
+    auto convert(__m256i bits) {
+        const auto v = floating(F{}, bits);
+        const auto d = truncated(v);
+        lost_ |= bitsOf(lanesWhere<_CMP_NEQ_UQ>(v, back(d)));
+        return d;
+    }
+    bool anyLost() const { return !_mm256_testz_si256(lost_, lost_); }
+
+  private:
+    static auto truncated(auto v) {
+        if constexpr (isBoolean<D>)
+            return toBoolean<F>(bitsOf(v));
+        else if constexpr (isFloating<D>)
+            return toFloating<F, D>(bitsOf(v));
+        else if constexpr (!std::is_same_v<D, std::uint32_t>)
+            return cut<4, sizeof(D)>(toInt32(v));
+        else if constexpr (std::is_same_v<F, double>)
+            return lowBits(integral<towardZero>(v));
+        else
+            return uint32ByHalves<FXP_ROUND_ZERO>(v);
+    }
+    static auto back(auto d) {
+        using Number = std::conditional_t<isBoolean<D>, std::uint8_t, D>;
+        return floating(F{}, toFloating<Number, F>(d));
+    }
+
+    __m256i lost_{};
+};
 
 struct Avx2 {
     static constexpr std::size_t registerBytes = 32;
@@ -295,19 +324,7 @@ struct Avx2 {
             return wrapped<D, rounding>(S{}, conversion::floating(S{}, v));
     }
 
-    template <class F, class D> static auto truncated(auto v) {
-        if constexpr (isFloating<D>)
-            return _mm_castps_si128(_mm256_cvtpd_ps(v));
-        else if constexpr (!std::is_same_v<D, std::uint32_t>)
-            return cut<4, sizeof(D)>(toInt32(v));
-        else if constexpr (std::is_same_v<F, double>)
-            return lowBits(integral<towardZero>(v));
-        else
-            return uint32ByHalves<FXP_ROUND_ZERO>(v);
-    }
-    template <class F, class D> static __m256i unlike(auto v, auto d) {
-        return bitsOf(conversion::lanesWhere<_CMP_NEQ_UQ>(v, conversion::floating(F{}, back<D>(F{}, d))));
-    }
+    template <class F, class D> using FloatingLosses = LossesBackAndForth<F, D>;
     template <class S> static __m256i unlikeSingle(S, __m256i v) {
         // 2^31, next to the highest, comes back as the lowest. From 2^31 on a single has all bits but the lowest eight.
         const __m256i differences = v ^ _mm256_cvttps_epi32(_mm256_cvtepi32_ps(v));
@@ -325,8 +342,8 @@ struct Avx2 {
         return bitsOf(conversion::lanesWhere<relation>(v, all(bound)));
     }
     static bool any(__m256i mask) { return !_mm256_testz_si256(mask, mask); }
-    template <int size> static __m256i signs(__m256i v) {
-        return size == 4 ? _mm256_srai_epi32(v, 31) : _mm256_srai_epi16(v, 15);
+    template <int size> static __m256i plus(__m256i v, std::uint32_t amount) {
+        return size == 4 ? _mm256_add_epi32(v, allLanes<4>(amount)) : _mm256_add_epi16(v, allLanes<2>(amount));
     }
     template <int size> static bool anyBit(__m256i v, std::uint32_t bits) {
         return !_mm256_testz_si256(v, allLanes<size>(bits));

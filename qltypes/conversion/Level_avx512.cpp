@@ -229,13 +229,84 @@ template <class S, class D, fxpModeOverflow_tag overflow> auto toInteger(auto v)
     }
 }
 
-// Elements of D back as numbers of type F; singles toward zero, so that no end of a range comes back as a power of two.
-template <class D> __m512d back(double, auto d) { return _mm512_castsi512_pd(toFloating<D, double>(d)); }
-template <class D> __m512 back(float, auto d) {
-    const __m512i wide = widened<D, 4, 16>(d);
-    return std::is_unsigned_v<D> ? _mm512_cvt_roundepu32_ps(wide, towardZero)
-                                 : _mm512_cvt_roundepi32_ps(wide, towardZero);
-}
+// Losses of floating elements. convert() gives what D has of them, and something else where it has not.
+
+// To narrower integers and boolean: rounding down and rounding up differ, or, once the range begins at zero, a bit is
+// set that no number of it has. What does not convert is the lowest integer in both directions, and outside.
+template <class F, class D> class LossesToNarrower {
+  public:
+    auto convert(__m512i bits) {
+        const auto v = floating(F{}, bits);
+        const __m512i down = toSigned<directionOf<FXP_ROUND_FLOOR>>(v);
+        const __m512i up = toSigned<directionOf<FXP_ROUND_CEILING>>(v);
+        differences_ |= down ^ up;
+        bits_ |= plus(down, belowZero);
+        return cut<sizeof(F), sizeof(D)>(down);
+    }
+    bool anyLost() const {
+        const __m512i lost = differences_ | _mm512_andnot_si512(plus(__m512i{}, belowZero + highestOf()), bits_);
+        return _mm512_test_epi64_mask(lost, lost) != 0;
+    }
+
+  private:
+    static constexpr std::int64_t highestOf() {
+        if constexpr (isBoolean<D>)
+            return 1;
+        else
+            return highest<D>;
+    }
+    static constexpr std::int64_t belowZero = std::is_signed_v<D> ? highestOf() + 1 : 0;
+    static __m512i plus(__m512i v, std::int64_t amount) {
+        if (amount == 0) return v;
+        return sizeof(F) == 8 ? _mm512_add_epi64(v, _mm512_set1_epi64(amount))
+                              : _mm512_add_epi32(v, _mm512_set1_epi32(static_cast<int>(amount)));
+    }
+
+    __m512i differences_{};
+    __m512i bits_{};
+};
+
+// To single and back. NaN may come back as it was, but shows itself by its magnitude.
+class LossesToSingle {
+  public:
+    __m256i convert(__m512i bits) {
+        const __m256 d = _mm512_cvtpd_ps(floating(double{}, bits));
+        differences_ |= bits ^ _mm512_castpd_si512(_mm512_cvtps_pd(d));
+        magnitudes_ = _mm512_max_epu64(magnitudes_, _mm512_add_epi64(bits, bits)); // the signs pushed out
+        return _mm256_castps_si256(d);
+    }
+    bool anyLost() const {
+        const __m512i infinity = _mm512_castpd_si512(all(__builtin_inf()));
+        return (_mm512_test_epi64_mask(differences_, differences_) |
+                _mm512_cmpgt_epu64_mask(magnitudes_, _mm512_add_epi64(infinity, infinity))) != 0;
+    }
+
+  private:
+    __m512i differences_{};
+    __m512i magnitudes_{};
+};
+
+// Singles to 32-bit integers and back, toward zero, so that no end of a range comes back as a power of two.
+template <class D> class LossesOfSingle {
+  public:
+    __m512i convert(__m512i bits) {
+        const __m512 v = floating(float{}, bits);
+        const __m512i d = std::is_unsigned_v<D> ? toUnsigned<towardZero>(v) : toSigned<towardZero>(v);
+        const __m512 back =
+            std::is_unsigned_v<D> ? _mm512_cvt_roundepu32_ps(d, towardZero) : _mm512_cvt_roundepi32_ps(d, towardZero);
+        lost_ = _kor_mask16(lost_, lanesWhere<_CMP_NEQ_UQ>(v, back));
+        return d;
+    }
+    bool anyLost() const { return lost_ != 0; }
+
+  private:
+    __mmask16 lost_ = 0;
+};
+
+template <class F, class D> struct LossesOf { using type = LossesToNarrower<F, D>; };
+template <> struct LossesOf<double, float> { using type = LossesToSingle; };
+template <> struct LossesOf<float, std::int32_t> { using type = LossesOfSingle<std::int32_t>; };
+template <> struct LossesOf<float, std::uint32_t> { using type = LossesOfSingle<std::uint32_t>; };
 
 struct Avx512 {
     static constexpr std::size_t registerBytes = 64;
@@ -285,17 +356,7 @@ struct Avx512 {
             return wrapped<D, rounding>(S{}, floating(S{}, v));
     }
 
-    template <class F, class D> static auto truncated(auto v) {
-        if constexpr (isFloating<D>)
-            return _mm256_castps_si256(_mm512_cvtpd_ps(v));
-        else if constexpr (std::is_unsigned_v<D>)
-            return saturatedUnsigned<sizeof(F), sizeof(D)>(toUnsigned<towardZero>(v));
-        else
-            return saturatedSigned<sizeof(F), sizeof(D)>(toSigned<towardZero>(v));
-    }
-    template <class F, class D> static auto unlike(auto v, auto d) {
-        return conversion::lanesWhere<_CMP_NEQ_UQ>(v, back<D>(F{}, d));
-    }
+    template <class F, class D> using FloatingLosses = typename LossesOf<F, D>::type;
     template <class S> static __m512i unlikeSingle(S, __m512i v) {
         if constexpr (std::is_signed_v<S>) // 2^31, next to the highest, comes back as the lowest
             return v ^ _mm512_cvttps_epi32(_mm512_cvtepi32_ps(v));
@@ -309,8 +370,8 @@ struct Avx512 {
         return conversion::lanesWhere<relation>(v, all(bound));
     }
     static bool any(auto mask) { return mask != 0; }
-    template <int size> static __m512i signs(__m512i v) {
-        return size == 4 ? _mm512_srai_epi32(v, 31) : _mm512_srai_epi16(v, 15);
+    template <int size> static __m512i plus(__m512i v, std::uint32_t amount) {
+        return size == 4 ? _mm512_add_epi32(v, allLanes<4>(amount)) : _mm512_add_epi16(v, allLanes<2>(amount));
     }
     template <int size> static bool anyBit(__m512i v, std::uint32_t bits) {
         return _mm512_test_epi32_mask(v, allLanes<size>(bits)) != 0;

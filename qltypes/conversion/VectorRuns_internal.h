@@ -7,12 +7,11 @@
 //   load<bytes>(p), load<bytes>(p, used)         a register of `bytes`; the second reads `used`, the rest is zero
 //   store<bytes>(p, v), store<bytes>(p, v, used)
 //   converted<S, D, rounding, overflow>(v)       elements of S to as many elements of D
-//   truncated<F, D>(v)                           right where D has the value, some other value of D elsewhere
-//   unlike<F, D>(v, d)                           mask of the elements that differ from what truncated() made of them
+//   FloatingLosses<F, D>                         convert(v) does, right where D has the value; anyLost() of all so far
 //   unlikeSingle(S{}, v)                         bits that differ once 32-bit integers have been singles
 //   floating(F{}, v), magnitude(v)               a whole register as floating elements
 //   lanesWhere<relation>(v, bound)               a mask; masks combine with & and |, any(mask) asks
-//   signs<size>(v), anyBit<size>(v, some)        lanes filled with their sign; whether a lane has one of some bits
+//   plus<size>(v, amount), anyBit<size>(v, some) the sum by lanes; whether a lane has one of some bits
 //   doubled32(v), most32(v, w)                   of unsigned 32-bit lanes: twice the lane cut off, the larger lanes
 //   anyFrom32(v, low, high)                      whether an even lane is at least `low` or an odd one at least `high`
 //   copyToMemory(src, dst, bytes), finishCopies()     as in Level
@@ -51,21 +50,24 @@ template <class S, class D, fxpModeOverflow_tag overflow> struct SameBits {
 
 // Notes of losses and overflows: note() takes a register of source elements, any() speaks of all that were noted.
 
-/// Integers are outside a range when they have a bit that no number of the range has. Where both types are signed the
-/// bits that count are those that differ from the sign.
+/// Integers are outside a range when they have a bit that no number of the range has. Where both types are signed that
+/// is told once the range begins at zero.
 template <class Vectors, class S, class D> class IntegersOutside {
   public:
     void note(typename Vectors::Bits v) {
-        if constexpr (std::is_signed_v<S> && std::is_signed_v<D>)
-            found_ |= v ^ Vectors::template signs<sizeof(S)>(v);
+        if constexpr (bothSigned)
+            found_ |= Vectors::template plus<sizeof(S)>(v, std::uint32_t{1} << (8 * sizeof(D) - 1));
         else
             found_ |= v;
     }
     bool any() const {
-        return Vectors::template anyBit<sizeof(S)>(found_, ~static_cast<std::uint32_t>(largestCommon<S, D>()));
+        constexpr std::uint32_t within =
+            bothSigned ? (std::uint32_t{1} << 8 * sizeof(D) % 32) - 1 : largestCommon<S, D>();
+        return Vectors::template anyBit<sizeof(S)>(found_, ~within);
     }
 
   private:
+    static constexpr bool bothSigned = std::is_signed_v<S> && std::is_signed_v<D>;
     typename Vectors::Bits found_{};
 };
 
@@ -137,56 +139,26 @@ template <class Vectors, class F, class D, fxpModeRounding_tag rounding> class P
     typename Vectors::Bits most_{};
 };
 
-/// Converts registers and notes whether an element is lost.
-template <class Vectors, class S, class D> class KeepingConversion {
+/// Converts registers of integers and notes whether an element is lost.
+template <class Vectors, class S, class D> class IntegerLosses {
   public:
     auto convert(auto v) {
-        if constexpr (isFloating<S> && isBoolean<D>) {
-            const auto number = Vectors::floating(S{}, v);
-            lost_ |= Vectors::template lanesWhere<_CMP_NEQ_UQ>(number, S(0)) &
-                     Vectors::template lanesWhere<_CMP_NEQ_UQ>(number, S(1));
-            return Vectors::template converted<S, D, FXP_ROUND_ZERO, FXP_OVERFLOW_WRAP>(v);
-        } else if constexpr (isFloating<S>) {
-            const auto number = Vectors::floating(S{}, v);
-            const auto result = Vectors::template truncated<S, D>(number);
-            lost_ |= Vectors::template unlike<S, D>(number, result);
-            return result;
-        } else {
-            using Bits = SameBits<S, D, FXP_OVERFLOW_WRAP>;
-            const auto result =
-                Vectors::template converted<typename Bits::Src, typename Bits::Dst, FXP_ROUND_ZERO, FXP_OVERFLOW_WRAP>(
-                    v);
-            if constexpr (sizeof(D) > sizeof(S))
-                notes_.note(result);
-            else
-                notes_.note(v);
-            return result;
-        }
-    }
-    bool anyLost() const {
-        if constexpr (isFloating<S>)
-            return Vectors::any(lost_);
+        using Bits = SameBits<S, D, FXP_OVERFLOW_WRAP>;
+        const auto result =
+            Vectors::template converted<typename Bits::Src, typename Bits::Dst, FXP_ROUND_ZERO, FXP_OVERFLOW_WRAP>(v);
+        if constexpr (sizeof(D) > sizeof(S))
+            notes_.note(result);
         else
-            return notes_.any();
+            notes_.note(v);
+        return result;
     }
+    bool anyLost() const { return notes_.any(); }
 
   private:
-    struct Nothing {};
-    // Integers are looked at as they are, or where they are widened afterwards: only negative ones are lost there.
-    template <class T>
-    using Integers =
-        std::conditional_t<isFloating<D>, IntegersUnlikeSingles<Vectors, T>, IntegersOutside<Vectors, T, D>>;
-    template <class T> struct NotesOf { using type = Integers<T>; };
-    template <class T>
-    requires(std::is_signed_v<T> && sizeof(D) > sizeof(T)) struct NotesOf<T> {
-        using type = IntegersOutside<Vectors, std::make_signed_t<D>, D>;
-    };
-    template <std::floating_point T> struct NotesOf<T> { using type = Nothing; };
-
-    using Number = std::conditional_t<isFloating<S>, S, double>;
-    decltype(Vectors::template lanesWhere<_CMP_NEQ_UQ>(Vectors::floating(Number{}, typename Vectors::Bits{}),
-                                                       Number{})) lost_{};
-    typename NotesOf<S>::type notes_;
+    // Where integers are widened, what is looked at is the result: only negative numbers are lost there.
+    using LookedAt =
+        typename std::conditional_t<(sizeof(D) > sizeof(S)), std::make_signed<D>, std::type_identity<S>>::type;
+    std::conditional_t<isFloating<D>, IntegersUnlikeSingles<Vectors, S>, IntegersOutside<Vectors, LookedAt, D>> notes_;
 };
 
 template <class Vectors> struct VectorRuns {
@@ -214,6 +186,10 @@ template <class Vectors> struct VectorRuns {
     static void finishCopies() { Vectors::finishCopies(); }
 
   private:
+    template <class S, class D>
+    using Losses = typename std::conditional_t<isFloating<S>, typename Vectors::template FloatingLosses<S, D>,
+                                               IntegerLosses<Vectors, S, D>>;
+
     template <std::size_t size> static void copyRun(const std::byte* src, std::byte* dst, std::size_t count) {
         std::memmove(dst, src, count * size);
     }
@@ -254,32 +230,35 @@ template <class Vectors> struct VectorRuns {
         }
     }
 
-    // Nothing is written before all of its step is known to be kept: the source may be the destination.
+    // Nothing is written before all that is read is known to be kept: the source may be the destination.
+    template <std::size_t times, class S, class D>
+    [[gnu::always_inline]] static bool keptRegisters(const std::byte* src, std::byte* dst) {
+        constexpr std::size_t srcBytes = lanes<S, D> * sizeof(S), dstBytes = lanes<S, D> * sizeof(D);
+        Losses<S, D> losses;
+        decltype(losses.convert(Vectors::template load<srcBytes>(src))) results[times];
+        repeat<times>(
+            [&](std::size_t k) { results[k] = losses.convert(Vectors::template load<srcBytes>(src + k * srcBytes)); });
+        if (losses.anyLost()) return false;
+        repeat<times>([&](std::size_t k) { Vectors::template store<dstBytes>(dst + k * dstBytes, results[k]); });
+        return true;
+    }
+
     template <class S, class D>
     static std::size_t convertWhileKept(const std::byte* src, std::byte* dst, std::size_t count) {
-        constexpr std::size_t perRegister = lanes<S, D>, unrolled = 4;
-        constexpr std::size_t srcBytes = perRegister * sizeof(S), dstBytes = perRegister * sizeof(D);
-        std::size_t left = count;
-        for (; left >= unrolled * perRegister; left -= unrolled * perRegister) {
-            KeepingConversion<Vectors, S, D> conversion;
-            decltype(conversion.convert(Vectors::template load<srcBytes>(src))) results[unrolled];
-            repeat<unrolled>([&](std::size_t k) {
-                results[k] = conversion.convert(Vectors::template load<srcBytes>(src + k * srcBytes));
-            });
-            if (conversion.anyLost()) return count - left;
-            repeat<unrolled>([&](std::size_t k) { Vectors::template store<dstBytes>(dst + k * dstBytes, results[k]); });
-            src += unrolled * srcBytes;
-            dst += unrolled * dstBytes;
-        }
-        while (left) {
-            const std::size_t some = left < perRegister ? left : perRegister;
-            KeepingConversion<Vectors, S, D> conversion;
-            const auto result = conversion.convert(Vectors::template load<srcBytes>(src, some * sizeof(S)));
-            if (conversion.anyLost()) return count - left;
-            Vectors::template store<dstBytes>(dst, result, some * sizeof(D));
-            src += some * sizeof(S);
-            dst += some * sizeof(D);
-            left -= some;
+        constexpr std::size_t perRegister = lanes<S, D>, unrolled = 8;
+        std::size_t done = 0;
+        for (; done + unrolled * perRegister <= count; done += unrolled * perRegister)
+            if (!keptRegisters<unrolled, S, D>(src + done * sizeof(S), dst + done * sizeof(D))) return done;
+        for (; done + perRegister <= count; done += perRegister)
+            if (!keptRegisters<1, S, D>(src + done * sizeof(S), dst + done * sizeof(D))) return done;
+        if (done < count) {
+            // What is left, filled up with zeros.
+            std::byte last[perRegister * sizeof(S)], converted[perRegister * sizeof(D)];
+            const std::size_t left = count - done;
+            Vectors::template store<sizeof last>(
+                last, Vectors::template load<sizeof last>(src + done * sizeof(S), left * sizeof(S)));
+            if (!keptRegisters<1, S, D>(last, converted)) return done;
+            std::memcpy(dst + done * sizeof(D), converted, left * sizeof(D));
         }
         return count;
     }
