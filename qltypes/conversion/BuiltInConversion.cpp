@@ -19,7 +19,8 @@ bool convertVector(const void* src, void* dst, std::size_t srcCount, std::size_t
     const Vectors vectors = {
         static_cast<const std::byte*>(src), static_cast<std::byte*>(dst), srcCount, dstCount, srcComplex, dstComplex};
     const bool checked = check && !holdsEveryValue<S, D>();
-    if (!checked && !srcComplex && !dstComplex && srcCount > 1 && dstCount - 1 < shortRun) {
+    const bool steps = srcCount > 1 || dstCount == 1;
+    if (!checked && !srcComplex && !dstComplex && steps && dstCount - 1 < shortRun) {
         levelInUse->convert[cell.slot](vectors.src, vectors.dst, dstCount);
         return true;
     }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <bit>
+#include <cstdint>
 #include <cstring>
 #include <limits>
 
@@ -11,12 +12,14 @@ namespace QLTypeSys::conversion {
 
 namespace {
 
-// A vector goes through the caches in blocks: long enough to amortise the calls, short enough that a block and what is
-// made of it stay in the first-level cache.
-constexpr std::size_t blockElements = 512;
-constexpr std::size_t blockBytes = blockElements * sizeof(double);
+// Where a vector takes two steps it takes them in blocks that stay in the first-level cache. Blocks on their way past
+// the caches are short, so that reading and writing overlap, and the source is called for a page ahead.
+constexpr std::size_t blockBytes = 4096;
+constexpr std::size_t passingBlockBytes = 1024;
+constexpr std::size_t bytesAhead = 4096;
+constexpr std::size_t lineBytes = 64;
 
-struct alignas(64) Block {
+struct alignas(lineBytes) Block {
     std::byte bytes[blockBytes];
 };
 
@@ -75,8 +78,8 @@ class Conversion {
           pastCaches_(vectors.src != vectors.dst && writtenBytes() > cachedBytes) {}
 
     bool run() {
-        const bool single = cell_.joinsParts ? vectors_.srcCount == 1 : vectors_.srcCount <= 1;
-        if (single)
+        const bool hasOneSource = cell_.joinsParts ? vectors_.srcCount == 1 : vectors_.srcCount <= 1;
+        if (hasOneSource && vectors_.dstCount > 1)
             broadcast();
         else if (cell_.joinsParts && vectors_.srcComplex)
             joinParts();
@@ -113,73 +116,71 @@ class Conversion {
             kept_ = !pairsOfSize(cell_.srcSize).anyImaginary(pairs, count, cell_.hasSignedZero);
     }
 
-    // Has `write` make the next `bytes` of the destination, there or in a block that then goes past the caches.
-    template <class Write> void emit(std::byte*& dst, std::size_t bytes, Write write) {
-        if (pastCaches_) {
-            write(outgoing_.bytes);
-            levelInUse->copyToMemory(outgoing_.bytes, dst, bytes);
-        } else {
-            write(dst);
+    // Takes the elements in blocks, `srcBytes` and `dstBytes` of each: step(from, to, count). What goes past the caches
+    // is made in a block first and leaves in whole lines.
+    template <class Step> void inBlocks(std::size_t srcBytes, std::size_t dstBytes, Step step) {
+        const std::byte* src = vectors_.src;
+        std::byte* dst = vectors_.dst;
+        const std::size_t wider = std::max(srcBytes, dstBytes);
+        const std::size_t perBlock = (pastCaches_ ? passingBlockBytes : blockBytes) / wider;
+        const std::size_t toWholeLine = -reinterpret_cast<std::uintptr_t>(dst) % lineBytes / dstBytes;
+        std::size_t count = pastCaches_ && toWholeLine ? std::min(toWholeLine, perBlock) : perBlock;
+        for (std::size_t left = vectors_.dstCount; left; left -= count, count = perBlock) {
+            count = std::min(count, left);
+            if (pastCaches_) {
+                callForSource(src, count * srcBytes);
+                step(src, outgoing_.bytes, count);
+                levelInUse->copyToMemory(outgoing_.bytes, dst, count * dstBytes);
+            } else {
+                step(src, dst, count);
+            }
+            src += count * srcBytes;
+            dst += count * dstBytes;
         }
-        dst += bytes;
     }
 
-    // Calls `step` with the number of elements of each block of the destination in turn.
-    template <class Step> void inBlocks(std::size_t count, std::size_t perBlock, Step step) {
-        for (; count > perBlock; count -= perBlock)
-            step(perBlock);
-        step(count);
+    static void callForSource(const std::byte* src, std::size_t bytes) {
+        const std::uintptr_t ahead = reinterpret_cast<std::uintptr_t>(src) + bytesAhead; // also beyond the end
+        for (std::size_t line = 0; line < bytes; line += lineBytes)
+            __builtin_prefetch(reinterpret_cast<const void*>(ahead + line), 0, 0);
     }
 
     void flat() {
-        const std::byte* src = vectors_.src;
-        std::byte* dst = vectors_.dst;
-        const std::size_t all = vectors_.dstCount << vectors_.srcComplex * !cell_.joinsParts;
-        if (!pastCaches_ || cell_.copiesBytes) return convertRun(src, dst, all);
-        inBlocks(all, blockElements, [&](std::size_t count) {
-            emit(dst, count * cell_.dstSize, [&](std::byte* to) { convertRun(src, to, count); });
-            src += count * cell_.srcSize;
-        });
+        const int parts = vectors_.srcComplex && !cell_.joinsParts ? 2 : 1;
+        if (!pastCaches_ || cell_.copiesBytes)
+            convertRun(vectors_.src, vectors_.dst, vectors_.dstCount * parts);
+        else
+            inBlocks(
+                cell_.srcSize * parts, cell_.dstSize * parts,
+                [&](const std::byte* from, std::byte* to, std::size_t count) { convertRun(from, to, count * parts); });
     }
 
     void realToComplex() {
-        const std::byte* src = vectors_.src;
-        std::byte* dst = vectors_.dst;
-        inBlocks(vectors_.dstCount, blockElements / 2, [&](std::size_t count) {
-            convertRun(src, parts_.bytes, count);
-            emit(dst, 2 * count * cell_.dstSize,
-                 [&](std::byte* to) { pairsOfSize(cell_.dstSize).addZeroParts(parts_.bytes, to, count); });
-            src += count * cell_.srcSize;
+        inBlocks(cell_.srcSize, 2 * cell_.dstSize, [&](const std::byte* from, std::byte* to, std::size_t count) {
+            convertRun(from, parts_.bytes, count);
+            pairsOfSize(cell_.dstSize).addZeroParts(parts_.bytes, to, count);
         });
     }
 
     void realPartsOnly() {
-        const std::byte* src = vectors_.src;
-        std::byte* dst = vectors_.dst;
-        inBlocks(vectors_.dstCount, blockElements / 2, [&](std::size_t count) {
-            testImaginary(src, count);
-            pairsOfSize(cell_.srcSize).takeRealParts(src, parts_.bytes, count);
-            emit(dst, count * cell_.dstSize, [&](std::byte* to) { convertRun(parts_.bytes, to, count); });
-            src += 2 * count * cell_.srcSize;
+        inBlocks(2 * cell_.srcSize, cell_.dstSize, [&](const std::byte* from, std::byte* to, std::size_t count) {
+            testImaginary(from, count);
+            pairsOfSize(cell_.srcSize).takeRealParts(from, parts_.bytes, count);
+            convertRun(parts_.bytes, to, count);
         });
     }
 
     // Complex to boolean: true when either part is. A survivor has no imaginary part, so the check asks as above.
     void joinParts() {
-        const std::byte* src = vectors_.src;
-        std::byte* dst = vectors_.dst;
-        inBlocks(vectors_.dstCount, blockElements / 2, [&](std::size_t count) {
-            testImaginary(src, count);
+        inBlocks(2 * cell_.srcSize, cell_.dstSize, [&](const std::byte* from, std::byte* to, std::size_t count) {
+            testImaginary(from, count);
             if (convertWhileKept_ && kept_) {
-                pairsOfSize(cell_.srcSize).takeRealParts(src, parts_.bytes, count);
+                pairsOfSize(cell_.srcSize).takeRealParts(from, parts_.bytes, count);
                 kept_ = convertWhileKept_(parts_.bytes, outgoing_.bytes, count) == count;
             }
-            run_(src, parts_.bytes, 2 * count);
-            emit(dst, count, [&](std::byte* to) {
-                for (std::size_t i = 0; i < count; ++i)
-                    to[i] = parts_.bytes[2 * i] | parts_.bytes[2 * i + 1];
-            });
-            src += 2 * count * cell_.srcSize;
+            run_(from, parts_.bytes, 2 * count);
+            for (std::size_t i = 0; i < count; ++i)
+                to[i] = parts_.bytes[2 * i] | parts_.bytes[2 * i + 1];
         });
     }
 
@@ -187,7 +188,6 @@ class Conversion {
     void broadcast() {
         Vectors one = vectors_;
         one.dst = parts_.bytes;
-        one.srcCount = 2; // steps, for the one element there is
         one.dstCount = 1;
         kept_ = convertInLayout(cell_, one, convertWhileKept_ != nullptr);
 
@@ -197,14 +197,16 @@ class Conversion {
         for (std::size_t filled = element; filled < repeated; filled *= 2)
             std::memcpy(parts_.bytes + filled, parts_.bytes, std::min(filled, repeated - filled));
 
-        std::byte* dst = vectors_.dst;
-        inBlocks(all, blockBytes, [&](std::size_t bytes) {
+        const auto copy = [&](const std::byte* from, std::byte* to, std::size_t bytes) {
             if (pastCaches_)
-                levelInUse->copyToMemory(parts_.bytes, dst, bytes);
+                levelInUse->copyToMemory(from, to, bytes);
             else
-                std::memcpy(dst, parts_.bytes, bytes);
-            dst += bytes;
-        });
+                std::memcpy(to, from, bytes);
+        };
+        std::size_t done = 0;
+        for (; done + repeated < all; done += repeated)
+            copy(parts_.bytes, vectors_.dst + done, repeated);
+        copy(parts_.bytes, vectors_.dst + done, all - done);
     }
 
     const Cell& cell_;
