@@ -1,5 +1,8 @@
 // The four views on the worked example, row by row, and what the random comparison does not reach.
-#include <cmath>
+#include <algorithm>
+#include <random>
+
+#include <malloc.h>
 
 #include "qltypes/structures/ElementAccess.h"
 #include "tests/structures/Builder.h"
@@ -268,6 +271,44 @@ TEST(Freezing, ChangedCountsAndDimensionsAreSeen) {
     e.record(e.outer)->clearDFSCache();
     EXPECT_STREQ(dfs.getName(9), "y");
 }
+
+// --- Memory ----------------------------------------------------------------------------------------------------------
+
+#ifndef __SANITIZE_ADDRESS__
+std::size_t bytesInUse() {
+    const struct mallinfo2 info = mallinfo2();
+    return info.uordblks + info.hblkhd;
+}
+
+TEST(Memory, DoesNotGrowWithTheIndicesAsked) {
+    Structures s;
+    const int inner = s.laidOut("In", {{"a", real}, {"b", real}, {"c", real}});
+    const int middle = s.laidOut("Mid", {{"x", real}, {"i", inner, {9}}});
+    const int id = s.laidOut("S", {{"m", middle, {2500}}});
+    const DFSElementAccess dfs(&s.table, id);
+    const long numNodes = dfs.getNumElements();
+    ASSERT_GT(numNodes, 95000);
+    std::vector<long> order;
+    for (long idx = 0; idx < 3 * numNodes; ++idx) // also far past the end
+        order.push_back(idx);
+    std::shuffle(order.begin(), order.end(), std::mt19937(1));
+    std::size_t before = 0;
+    for (std::size_t i = 0; i < order.size(); ++i) {
+        if (i == 1000) before = bytesInUse();
+        dfs.getStructElement(order[i]);
+        dfs.getOffset(order[i]);
+    }
+    // A cached element for each would be 300,000 times 64 bytes and more; this is bits, and words of them past the end.
+    EXPECT_LT(bytesInUse(), before + 800000);
+    before = bytesInUse();
+    s.record(id)->clearDFSCache();
+    for (long idx = 0; idx < numNodes; ++idx) {
+        dfs.getStructElement(idx);
+        dfs.getOffset(idx);
+    }
+    EXPECT_LT(bytesInUse(), before) << "a walk in order needs next to nothing";
+}
+#endif
 
 // --- Odd structures --------------------------------------------------------------------------------------------------
 

@@ -124,19 +124,22 @@ void compareAll(const DataTypeTable& table, SlowViews& slow, int id) {
 
 TEST(ElementViews, RandomStructuresAtEveryIndex) {
     long numStructures = 0;
+    int deepest = 0;
     for (unsigned seed = 1; seed <= 300; ++seed) {
         SCOPED_TRACE("seed " + std::to_string(seed));
         RandomStructures random(seed);
         SlowViews slow(random.table);
         for (int i = 0; i < 12; ++i)
-            random.addStructure(60);
+            random.addStructure(seed % 4 == 0 ? 300 : 60);
         for (const int id : random.structures) {
             SCOPED_TRACE("structure " + std::to_string(id));
             STOP_ON_FAILURE(compareAll(random.table, slow, id));
             ++numStructures;
+            deepest = std::max(deepest, random.depth(id));
         }
     }
     EXPECT_GT(numStructures, 2000);
+    EXPECT_GE(deepest, 8);
 }
 
 } // namespace

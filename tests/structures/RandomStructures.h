@@ -1,6 +1,7 @@
 // Tables of random structures, nested in each other, under a seed that failures print.
 #pragma once
 
+#include <algorithm>
 #include <random>
 #include <string>
 #include <vector>
@@ -71,6 +72,14 @@ class RandomStructures : public Structures {
         structures.push_back(id);
         if (chance(33)) structures.push_back(alias("A" + std::to_string(id), id));
         return id;
+    }
+
+    /// How deep structures are nested in each other, 1 for one without a nested structure.
+    int depth(int id) {
+        int deepest = 0;
+        for (const StructElement* e : record(id)->getElements())
+            if (DtIsStructType(&table, e->dataTypeId)) deepest = std::max(deepest, depth(e->dataTypeId));
+        return deepest + 1;
     }
 
     std::vector<int> leaves;
