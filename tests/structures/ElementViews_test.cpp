@@ -122,6 +122,22 @@ void compareAll(const DataTypeTable& table, SlowViews& slow, int id) {
     }
 }
 
+TEST(ElementViews, WideStructuresAtEveryIndex) {
+    for (unsigned seed = 1; seed <= 10; ++seed) {
+        SCOPED_TRACE("seed " + std::to_string(seed));
+        RandomStructures random(seed);
+        SlowViews slow(random.table);
+        const int small = random.laidOut("Small", {{"a", random.oneOf(random.leaves)}, {"b", DATA_TYPE_ID_INT8, {2}}});
+        std::vector<Element> elements;
+        for (long i = random.pick(8, 250); i > 0; --i) {
+            const bool isNested = random.chance(seed % 2 ? 10 : 60);
+            elements.push_back({"e" + std::to_string(i), isNested ? small : random.oneOf(random.leaves),
+                                isNested && i % 50 == 1 ? std::vector{200L} : random.dims(), random.chance(10)});
+        }
+        STOP_ON_FAILURE(compareAll(random.table, slow, random.laidOut("Wide", elements)));
+    }
+}
+
 TEST(ElementViews, RandomStructuresAtEveryIndex) {
     long numStructures = 0;
     int deepest = 0;

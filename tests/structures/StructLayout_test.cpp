@@ -228,6 +228,19 @@ TEST(StructLayout, GroundIsBuiltOfTheGroundsOfTheElements) {
     EXPECT_FALSE(s.record(zero)->groundHasNonZeroStoredValue());
 }
 
+TEST(StructLayout, ASecondRunWritesTheGroundAnew) {
+    Structures s;
+    const int p3 = s.plain("P3", 3);
+    const unsigned char bytes[] = {1, 2, 3};
+    s.table.getDataTypeAt(static_cast<unsigned long>(p3 + 1))->setGround(bytes);
+    const int id = s.laidOut("S", {{"a", p3}, {"b", p3}});
+    s.element(id, 0)->setDataTypeId(int8);
+    s.element(id, 1)->setDataTypeId(int32);
+    EXPECT_EQ(described(DtComputeDerivedStructAttributes(&s.table, id)), fine);
+    const unsigned char expected[] = {0, 2, 3, 0, 0, 0, 0, 0}; // padding stays as it was
+    EXPECT_EQ(std::memcmp(s.record(id)->getGround(), expected, sizeof expected), 0);
+}
+
 TEST(StructLayout, AGroundOfManyElements) {
     Structures s;
     const int p3 = s.plain("P3", 3);
