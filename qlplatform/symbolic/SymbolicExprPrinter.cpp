@@ -5,29 +5,11 @@
 #include <string_view>
 #include <vector>
 
+#include "qlplatform/symbolic/ExprSpelling_internal.h"
 #include "qlplatform/symbolic/NodeStore_internal.h"
 
 namespace QL {
 namespace {
-
-// How tightly operators bind, loosest first. An operator of some level takes operands of that level and above.
-enum Level : int {
-    orLevel,
-    andLevel,
-    equalLevel,
-    orderLevel,
-    sumLevel,
-    productLevel,
-    signLevel,
-    powerLevel,
-    atomLevel
-};
-
-// One way to write an operator: between its operands, or as a function when `level` is atomLevel.
-struct Spelling {
-    std::string_view text;
-    Level level;
-};
 
 class TextWriter {
   public:
@@ -69,7 +51,7 @@ class TextWriter {
         const SymbolicOp op = store_.op(id);
         if (op == SymbolicOp::ND) return writeList(id, "[", " ", "]");
         if (numOperands == 0) return writeTerminal(id, allowed);
-        const Spelling spelling = spellingOf(op);
+        const Spelling spelling = spellingOf(op, hostOperators_, hostFunctions_);
         if (spelling.level == atomLevel) {
             text_ += spelling.text;
             return writeList(id, "(", ", ", ")");
@@ -81,13 +63,25 @@ class TextWriter {
         }
         if (numOperands == 1) {
             text_ += spelling.text;
-            // Two signs in a row would read as another operator.
-            later(store_.operand(id, 0), op == SymbolicOp::UnaryMinus ? powerLevel : signLevel);
+            writeSigned(op, store_.operand(id, 0));
             return;
         }
         later(store_.operand(id, 1), static_cast<Level>(spelling.level + 1));
         later(spelling.text);
         later(store_.operand(id, 0), spelling.level);
+    }
+
+    // The operand behind a prefix: two signs in a row would read as another operator, and -3 as a negative number.
+    void writeSigned(SymbolicOp op, NodeId operand) {
+        const SymbolicOp inner = store_.op(operand);
+        const bool isNumber = inner == SymbolicOp::IntValue || inner == SymbolicOp::DoubleValue;
+        if (op == SymbolicOp::UnaryMinus && isNumber) {
+            later(")");
+            later(operand, orLevel);
+            later("(");
+        } else {
+            later(operand, op == SymbolicOp::UnaryMinus ? powerLevel : signLevel);
+        }
     }
 
     void writeList(NodeId id, std::string_view before, std::string_view between, std::string_view after) {
@@ -122,68 +116,6 @@ class TextWriter {
         std::string text(digits, end);
         if (!hostNumbers_ && text.find_first_of(".e") == std::string::npos) text += ".0";
         return text;
-    }
-
-    Spelling spellingOf(SymbolicOp op) const {
-        switch (op) {
-        case SymbolicOp::UnaryMinus:
-            return {"-", signLevel};
-        case SymbolicOp::Plus:
-            return {" + ", sumLevel};
-        case SymbolicOp::Minus:
-            return {" - ", sumLevel};
-        case SymbolicOp::Multiply:
-            return {"*", productLevel};
-        case SymbolicOp::Divide:
-            return {"/", productLevel};
-        case SymbolicOp::Modulo:
-            return hostOperators_ ? Spelling{"rem", atomLevel} : Spelling{" % ", productLevel};
-        case SymbolicOp::Power:
-            return hostOperators_ ? Spelling{"^", powerLevel} : Spelling{"pow", atomLevel};
-        case SymbolicOp::Equal: // the host language ranks all comparisons alike
-            return {" == ", hostOperators_ ? orderLevel : equalLevel};
-        case SymbolicOp::NotEqual:
-            return hostOperators_ ? Spelling{" ~= ", orderLevel} : Spelling{" != ", equalLevel};
-        case SymbolicOp::LessThan:
-            return {" < ", orderLevel};
-        case SymbolicOp::LessThanOrEqual:
-            return {" <= ", orderLevel};
-        case SymbolicOp::GreaterThan:
-            return {" > ", orderLevel};
-        case SymbolicOp::GreaterThanOrEqual:
-            return {" >= ", orderLevel};
-        case SymbolicOp::And:
-            return {" && ", andLevel};
-        case SymbolicOp::Or:
-            return {" || ", orLevel};
-        case SymbolicOp::Not:
-            return {hostOperators_ ? "~" : "!", signLevel};
-        case SymbolicOp::Min:
-            return {"min", atomLevel};
-        case SymbolicOp::Max:
-            return {"max", atomLevel};
-        case SymbolicOp::Abs:
-            return {"abs", atomLevel};
-        case SymbolicOp::Floor:
-            return {"floor", atomLevel};
-        case SymbolicOp::Ceil:
-            return {"ceil", atomLevel};
-        case SymbolicOp::Round:
-            return {"round", atomLevel};
-        case SymbolicOp::Fix:
-            return {hostFunctions_ ? "fix" : "trunc", atomLevel};
-        case SymbolicOp::Mod:
-            return {"mod", atomLevel};
-        case SymbolicOp::Rem:
-            return {"rem", atomLevel};
-        case SymbolicOp::StringSymbol:
-        case SymbolicOp::IntValue:
-        case SymbolicOp::DoubleValue:
-        case SymbolicOp::BoolSymbol:
-        case SymbolicOp::ND:
-            break;
-        }
-        return {"", atomLevel};
     }
 
     const SymbolicExprTable& table_;

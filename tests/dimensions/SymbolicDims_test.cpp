@@ -132,7 +132,7 @@ TEST_F(SymbolicDimsTest, ArithmeticIsSimplified) {
 TEST_F(SymbolicDimsTest, TheNegativeIsNotSimplified) {
     EXPECT_EQ((-k).toString(), "-K");
     const SymbolicDims negative = -number(3);
-    EXPECT_EQ(negative.toString(), "-3");
+    EXPECT_EQ(negative.toString(), "-(3)");
     EXPECT_NE(negative.getId(), number(-3).getId()); // kept
     EXPECT_FALSE(table.getValueOf(negative.getId()).first);
     EXPECT_EQ((-(-k)).toString(), "-(-K)");
