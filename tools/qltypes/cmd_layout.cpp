@@ -18,6 +18,7 @@
 #include "output/LayoutJson.h"
 #include "output/LayoutText.h"
 #include "output/Output.h"
+#include "picture/Svg.h"
 #include "table/ChecksumReader.h"
 #include "table/NodeReader.h"
 #include "table/TypeLoader.h"
@@ -143,8 +144,10 @@ void addLayoutCommand(CLI::App& app) {
             ->excludes(checksum);
     CLI::Option* const json = command->add_flag("--json", options->asJson, "Print JSON with stable keys");
     CLI::Option* const format =
-        command->add_option("--format", options->format, "c: print a C header that asserts every size and offset")
-            ->check(CLI::IsMember({"c"}))
+        command
+            ->add_option("--format", options->format,
+                         "c: print a C header that asserts every size and offset; svg: draw the bytes as a map")
+            ->check(CLI::IsMember({"c", "svg"}))
             ->excludes(json)
             ->excludes(node)
             ->excludes(numberings)
@@ -157,6 +160,7 @@ void addLayoutCommand(CLI::App& app) {
         "  qltypes layout --json types.json | jq '.structures[].size'\n"
         "  qltypes layout types.json --only Outer --node 'y(1).b'\n"
         "  qltypes layout types.json --format c --padding > types.h\n"
+        "  qltypes layout types.json --only Outer --format svg > outer.svg\n"
         "  qltypes layout /usr/share/geometry_msgs/msg --only geometry_msgs/Pose\n"
         "  echo '{\"types\": [{\"name\": \"P\", \"elements\": [{\"name\": \"x\", \"type\": \"double\"}]}]}' |"
         " qltypes layout -");
@@ -174,7 +178,9 @@ void addLayoutCommand(CLI::App& app) {
             const NodeLayout found = reader.node(indexOf(reader, *options->node, label));
             return print(options->asJson ? nodeJson(label, found) : nodeText(label, found, coloursOfOutput()));
         }
-        if (!options->format.empty()) {
+        if (options->withPadding && options->format != "c") throw UsageError("--padding: only with --format c");
+        if (options->format == "svg") return print(layoutSvg(layout, all));
+        if (options->format == "c") {
             orderForC(layout, all, table);
             return print(cHeader(layout, options->withPadding));
         }

@@ -1,5 +1,5 @@
-// What `qltypes layout` shows, as plain values: filled by TypeLoader from the library's answers, printed by LayoutText
-// and LayoutJson.
+// What `qltypes layout` shows, as plain values: filled by TypeLoader from the library's answers, printed by LayoutText,
+// LayoutJson and the pictures.
 #pragma once
 
 #include <cstdint>
@@ -28,10 +28,14 @@ struct CType {
     std::int64_t alignment = 1; ///< of the C type, in bytes; that of a structure as it is declared here
 };
 
+/// What sort of value a type holds, behind its aliases.
+enum class TypeKind { Float, Integer, Boolean, FixedPoint, Enumeration, Structure, Other };
+
 struct ElementLayout {
     std::string name;
     std::string typeName;
     std::string typeLabel; ///< the type's name for people
+    TypeKind typeKind = TypeKind::Other;
     std::vector<std::int64_t> dimensions;
     bool isComplex = false;
     bool isFrameBased = false;

@@ -2,32 +2,14 @@
 
 #include <algorithm>
 #include <array>
-#include <cmath>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include "output/ElementText.h"
+
 namespace inspector {
 namespace {
-
-std::string nameWithDimensions(const ElementLayout& element) {
-    std::string text = element.name;
-    if (element.dimensions == std::vector<std::int64_t>{1}) return text;
-    for (const std::int64_t dimension : element.dimensions)
-        text += fmt::format("[{}]", dimension);
-    return text;
-}
-
-std::string notesOf(const ElementLayout& element) {
-    std::vector<std::string> notes;
-    if (!element.unit.empty()) notes.push_back(fmt::format("unit {}", element.unit));
-    if (std::isfinite(element.min)) notes.push_back(fmt::format("min {}", element.min));
-    if (std::isfinite(element.max)) notes.push_back(fmt::format("max {}", element.max));
-    if (element.isFrameBased) notes.push_back("frame based");
-    if (element.hasVariableDimensions) notes.push_back("variable dimensions");
-    if (element.move) notes.push_back(element.move->reason);
-    return fmt::format("{}", fmt::join(notes, "; "));
-}
 
 std::string number(std::int64_t value) { return std::to_string(value); }
 std::string number(const std::optional<std::int64_t>& value) { return value ? std::to_string(*value) : ""; }
@@ -37,8 +19,6 @@ std::string rawText(const NodeLayout& node) {
     const auto [first, last] = *node.raw;
     return first == last ? number(first) : fmt::format("{}-{}", first, last);
 }
-
-std::string typeText(bool isComplex, const std::string& label) { return (isComplex ? "complex " : "") + label; }
 
 std::string nodesText(const StructureLayout& structure, const Colours& colours) {
     TextTable table({{"depth-first", Align::Right},

@@ -23,6 +23,7 @@
 #include "qltypes/types/DataTypeTableUtils.h"
 #include "qltypes/types/ql_enum_utils.h"
 #include "table/CTypes.h"
+#include "table/TypeKinds.h"
 
 namespace inspector {
 namespace {
@@ -216,6 +217,7 @@ ElementLayout TypeLoader::elementLayout(const QLTypeSys::ImmediateElementAccess&
     element.name = view.getName(index);
     element.typeName = DtGetDataTypeName(&table_, typeId);
     element.typeLabel = labelOf(element.typeName);
+    element.typeKind = kindOf(table_, typeId);
     element.dimensions.assign(dimensions, dimensions + view.getNumDimensions(index));
     element.isComplex = view.getSignalType(index) == 1;
     element.isFrameBased = view.getSamplingMode(index) == 1;
