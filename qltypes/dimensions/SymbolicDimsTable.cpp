@@ -27,8 +27,12 @@ unsigned long wholeNumberOf(double value) {
 
 } // namespace
 
-SymbolicDimsTable::SymbolicDimsTable() : SymbolRegistry(QL::SymbolDomain::Integers) { initialize(); }
-SymbolicDimsTable::~SymbolicDimsTable() = default;
+SymbolicDimsTable::SymbolicDimsTable()
+    : SymbolRegistry(QL::SymbolDomain::Integers), constraints_(std::make_unique<SymbolicDimsConstraints>(this)) {
+    initialize();
+}
+
+SymbolicDimsTable::~SymbolicDimsTable() { constraints_.reset(); }
 
 void SymbolicDimsTable::initialize() {
     QL::SymbolicExprTable& exprs = getExprTable();
@@ -42,11 +46,13 @@ void SymbolicDimsTable::initialize() {
 }
 
 void SymbolicDimsTable::resetToBuiltin() {
+    constraints_.reset();
     dropExprTable();
     displayStrings_.clear();
     torvexExprs_.clear();
     headerFiles_.clear();
     makeExprTable();
+    constraints_ = std::make_unique<SymbolicDimsConstraints>(this);
     initialize();
 }
 

@@ -13,6 +13,7 @@
 #pragma once
 
 #include <iosfwd>
+#include <memory>
 #include <set>
 #include <string>
 #include <unordered_map>
@@ -148,6 +149,40 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
     /// Adds the header files of the symbols of `id` to the set; of an invalid id none.
     void getHeaderFiles(int id, std::set<std::string>& files) const;
 
+    // What is known of dimensions, kept by the constraint store (QLSymbolicDimsConstraints.h has meanings and
+    // failures). The block is replaced by getOriginalBlock(block). A statement about an id that is no symbolic
+    // dimension is ignored. Unchecked: the ids of questions must be valid.
+
+    void addEqualRelation(int a, int b, const QLBlock* block);
+    void addEqualConstraint(int a, int value, const QLBlock* block);
+    void addGreaterThanRelation(int a, int b, const QLBlock* block);
+    void addGreaterThanConstraint(int a, int value, const QLBlock* block);
+    void addLessThanConstraint(int a, int value, const QLBlock* block);
+    void addRange(int a, int min, int max, const QLBlock* block, GenerateCodeFlags flags);
+
+    bool hasEqualRelation(int a, int b);
+    bool hasGreaterThanRelation(int a, int b);
+    SymbDimsRange getRange(int a) const;
+    /// By the bounds alone: whether both are the number, the lower one is above it, the upper one is below it.
+    bool hasEqualConstraint(int a, int value);
+    bool hasGreaterThanConstraint(int a, int value);
+    bool hasLessThanConstraint(int a, int value);
+
+    // Blocks of the listings are taken as they are.
+    void getSymbolicDimsConstraints(std::vector<SymbolicDimsConstraint>& list) const;
+    void getSymbolicDimsConstraints(std::vector<int>& ids) const;
+    void getSymbolicDimsConstraints(const QLBlock* block, std::vector<int>& ids) const;
+    void getSymbolicDimsConstraints(const QLBlock* block, const boost::function<const QLBlock*(const QLBlock*)>& mapper,
+                                    std::vector<int>& ids) const;
+    void getEquivalentSymbolicDims(std::vector<SymbolicDimsCGConstraint>& list) const;
+    void getGreaterThanSymbolicDims(std::vector<SymbolicDimsCGConstraint>& list) const;
+    void getLessThanSymbolicDims(std::vector<SymbolicDimsCGConstraint>& list) const;
+
+    /// Whether two expressions, by their expression ids, are equal once simplified, or are known to be; the answer
+    /// comes twice. Each is stated to equal its simplified form, by no block, which raises as addEqual. Unchecked: the
+    /// ids must be below getNumSymbolicDimss().
+    std::pair<bool, bool> equalSymbolicDims(unsigned long a, unsigned long b);
+
     // Operators in use.
 
     /// Appends one record for each expression of the operator, oldest first, with its two operands and no blocks.
@@ -177,6 +212,7 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
     std::vector<int> dimensionIds(int id) const;
     int listOf(const std::vector<int>& dimensions);
 
+    std::unique_ptr<SymbolicDimsConstraints> constraints_;
     std::vector<std::string> displayStrings_; // by expression id; cut at a reset
     std::unordered_map<int, std::string> headerFiles_;
     unsigned long oneIntExprId_ = 0;
