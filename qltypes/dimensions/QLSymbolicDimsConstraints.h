@@ -109,7 +109,7 @@ class QL_EXPORT SymbolicDimsConstraints {
     void getGreaterThanSymbolicDims(std::vector<SymbolicDimsCGConstraint>& list) const;
     void getLessThanSymbolicDims(std::vector<SymbolicDimsCGConstraint>& list) const;
 
-    class Impl;
+    class [[gnu::visibility("hidden")]] Impl;
 
   private:
     const std::unique_ptr<Impl> impl_;

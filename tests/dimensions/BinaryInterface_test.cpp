@@ -1,0 +1,49 @@
+// Slots of virtual operations, which are the binary interface.
+#include "qltypes/dimensions/NumericDims.h"
+#include "qltypes/dimensions/SymbolicDimsTable.h"
+#include "tests/support/Slots.h"
+
+namespace {
+
+using namespace QLTypeSys;
+using testsupport::slotOf;
+
+using Table = SymbolicDimsTable;
+using Registry = QL::SymbolRegistry;
+using Token = Table::DimsRegistration (Table::*)(const char*, const QLBlock*);
+
+// clang-format off
+TEST(BinaryInterface, SlotsOfTheTableOfDimensions) {
+    const std::vector<std::size_t> slots = {
+        slotOf(static_cast<Registry::Registration (Registry::*)(const std::string&, const QLBlock*, const QlDims&)>(&Registry::registerSymbolicTExpr)),
+        slotOf(static_cast<Registry::Registration (Registry::*)(const std::u16string&, const QLRootBD*, QlWorkspace*, QlEvalClient*, std::vector<double>&)>(&Registry::registerSymbolicTExpr)),
+        slotOf(&Registry::getSymbolsFromExpressionId),
+        slotOf(&Registry::addSymbolDataTypeInformation),
+        slotOf(static_cast<Registry::Registration (Table::*)(const std::u16string&, QL::SymbolValidator&, std::vector<double>&)>(&Table::registerSymbolicTExpr)),
+        slotOf(&Table::getOriginalBlock),
+        slotOf(&Table::CreateSymbolicDimsTable),
+        slotOf(&Table::resetToBuiltin),
+        slotOf(static_cast<Token>(&Table::registerSymbolicDims)),
+        slotOf(static_cast<Token>(&Table::registerSymbolicDimsExpr)),
+        slotOf(&Table::reportLossOfSymbolicDimensions),
+        slotOf(&Table::isLossOfSymbolicDimsDiagEnabled),
+        slotOf(&Table::registerReferencedSymbolInParamTable),
+    };
+    for (std::size_t i = 0; i < slots.size(); ++i)
+        EXPECT_EQ(slots[i], 2 + i) << "operation " << i + 1; // behind the two forms of the destructor
+}
+// clang-format on
+
+TEST(BinaryInterface, SlotsOfNumericDims) {
+    EXPECT_EQ(slotOf(&NumericDims::getNumDims), 2u);
+    EXPECT_EQ(slotOf(&NumericDims::getDim), 3u);
+    EXPECT_EQ(slotOf(&NumericDims::getWidth), 4u);
+}
+
+TEST(BinaryInterface, TheStoreIsAPointer) {
+    EXPECT_FALSE(std::is_polymorphic_v<SymbolicDimsConstraints>);
+    EXPECT_EQ(sizeof(SymbolicDimsConstraints), sizeof(void*));
+    EXPECT_FALSE(std::is_polymorphic_v<SymbolicDims>);
+}
+
+} // namespace
