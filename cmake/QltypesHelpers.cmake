@@ -31,6 +31,7 @@ function(qltypes_library_settings target)
     PROPERTIES CXX_VISIBILITY_PRESET hidden
                VISIBILITY_INLINES_HIDDEN ON
                POSITION_INDEPENDENT_CODE ON
+               DEFINE_SYMBOL "" # objects are the same in shared and in static libraries
                VERSION ${PROJECT_VERSION}
                SOVERSION ${PROJECT_VERSION_MAJOR}
                INSTALL_RPATH "$ORIGIN")

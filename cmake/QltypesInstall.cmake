@@ -1,5 +1,6 @@
 # What `cmake --install` puts where: headers, both libraries, the inspector, the CMake package and the pkg-config files.
-# Always on, also below a parent project, whose own exported targets may depend on these.
+# Always on, also below a parent project, whose own exported targets may depend on these. Components: `runtime` has the
+# shared libraries, `development` what a build against them needs (static libraries too), `tools` the inspector.
 
 include(CMakePackageConfigHelpers)
 
@@ -8,11 +9,17 @@ set(packageDir "${CMAKE_INSTALL_LIBDIR}/cmake/qltypes")
 install(
   TARGETS platform qltypes
   EXPORT qltypesTargets
-  RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}"
   LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}"
           COMPONENT runtime
           NAMELINK_COMPONENT development
   ARCHIVE DESTINATION "${CMAKE_INSTALL_LIBDIR}" COMPONENT development)
+
+if(BUILD_SHARED_LIBS)
+  install(FILES "${PROJECT_SOURCE_DIR}/LICENSE" DESTINATION "${CMAKE_INSTALL_DATADIR}/doc/qltypes" COMPONENT runtime)
+else()
+  install(FILES "${PROJECT_SOURCE_DIR}/LICENSE" DESTINATION "${CMAKE_INSTALL_DATADIR}/doc/qltypes"
+          COMPONENT development)
+endif()
 
 qltypes_public_headers(headers)
 foreach(header IN LISTS headers)
@@ -20,6 +27,9 @@ foreach(header IN LISTS headers)
   install(FILES "${PROJECT_SOURCE_DIR}/${header}" DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}/${folder}"
           COMPONENT development)
 endforeach()
+
+# Libraries that only the static form leaves to whoever links it.
+set(privateLibraries md flint gmp)
 
 configure_package_config_file("${PROJECT_SOURCE_DIR}/cmake/qltypesConfig.cmake.in"
                               "${PROJECT_BINARY_DIR}/cmake/qltypesConfig.cmake" INSTALL_DESTINATION "${packageDir}")
@@ -47,6 +57,8 @@ else()
   string(REGEX REPLACE "/$" "" up "${up}")
   set(pcPrefix "\${pcfiledir}/${up}")
 endif()
+list(TRANSFORM privateLibraries PREPEND "-l" OUTPUT_VARIABLE pcPrivateLibraries)
+list(JOIN pcPrivateLibraries " " pcPrivateLibraries)
 qltypes_pc_path(pcLibDir "${CMAKE_INSTALL_LIBDIR}")
 qltypes_pc_path(pcIncludeDir "${CMAKE_INSTALL_INCLUDEDIR}")
 foreach(name qltypes qlplatform)

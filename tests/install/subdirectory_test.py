@@ -24,7 +24,8 @@ shutil.rmtree(work, ignore_errors=True)
 work.mkdir(parents=True)
 configure = ("cmake", "-G", "Ninja", project, f"-DQLTYPES_SOURCE={source}", f"-DCMAKE_CXX_COMPILER={compiler}",
              "-DCMAKE_BUILD_TYPE=Debug")
-run(*configure, "-B", "static")  # what a parent gets that does not say otherwise
+run(*configure, "-B", "static", "-DFETCHED=ON")  # what a parent gets that does not say otherwise
+assert (work / "static/_deps/qltypes-build").is_dir(), "a fetched library is not part of the build"
 run(*configure, "-DBUILD_SHARED_LIBS=ON")
 
 commands = run("ninja", "-t", "commands", "consumer").splitlines()

@@ -19,7 +19,9 @@ isThere() {
     case $1 in
     g++) has c++ ;;
     ninja-build) has ninja ;;
-    cmake | git | python3 | pkg-config) has "$1" ;;
+    cmake | git | python3 | pkg-config | file) has "$1" ;;
+    clang) has clang++ ;;
+    dpkg-dev) has dpkg-shlibdeps ;;
     python3-*) python3 -c "import ${1#python3-}" 2>/dev/null ;;
     libboost*-dev) hasHeader boost/version.hpp ;;
     libgtest-dev) hasHeader gtest/gtest.h ;;
