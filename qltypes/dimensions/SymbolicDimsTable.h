@@ -22,10 +22,15 @@
 
 #include "qlplatform/Export.h"
 #include "qlplatform/symbolic/SymbolRegistry.h"
+#include "qlplatform/symbolic/SymbolValidator.h"
 #include "qltypes/dimensions/QLSymbolicDimsConstraints.h"
 #include "qltypes/dimensions/SymbolicDims.h"
 
+struct txArray_tag;
+
 namespace QLTypeSys {
+
+class NumericDims;
 
 class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
   public:
@@ -58,6 +63,60 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
 
     /// Is told of a symbol that parameters refer to; does nothing here.
     virtual void registerReferencedSymbolInParamTable(int id, const QLBlock* block);
+
+    // Dimensions from text. Texts of the host language are read as SymbolicDimsFromTParseTree.h says. A diagnostic that
+    // is returned belongs to the caller; it can stand beside a valid id.
+
+    /// Registers the dimensions that `text` gives for a signal whose numeric dimensions are `dims`: an expression id,
+    /// SymbolicExprTable::noExpr for a text that has no symbols or cannot be read. For a signal without elements it is
+    /// 1, NOSYMBOLIC; the text is then read only to tell reportLossOfSymbolicDimensions() of it, where that is enabled.
+    virtual Registration registerSymbolicTExpr(const std::string& text, const NumericDims& dims,
+                                               QL::SymbolValidator& validator);
+    /// Registers the dimensions that `text` gives: an expression id, 1 for a text that cannot be read. `values` becomes
+    /// what eval() gives for them and stays as it is when there are none. The dimensions of 1 at the end, beyond the
+    /// third, are told to reportLossOfSymbolicDimensions() where that is enabled.
+    Registration registerSymbolicTExpr(const std::u16string& text, QL::SymbolValidator& validator,
+                                       std::vector<double>& values) override;
+    using QL::SymbolRegistry::registerSymbolicTExpr;
+
+    /// Registers one token: a decimal number of 32 bits, or the name of a symbol with the value that `validator` gives
+    /// it. Id -2 with a diagnostic when that value is refused. Throws boost::bad_lexical_cast for the empty token and
+    /// for numbers written otherwise: hexadecimal, octal, behind blanks, out of range.
+    DimsRegistration registerSymbolicDims(const char* text, QL::SymbolValidator& validator);
+
+    /// Gives each symbol of `id` that has none the value of the validator. Null on success; otherwise what the first
+    /// refused value gave.
+    qlsvDiagnosticImpl* registerSymbolicIdValues(int id, QL::SymbolValidator& validator);
+
+    /// The number that a host array holds, as a dimension; 0 when it holds no real scalar. `name`, `text` and
+    /// `position` say where it is from. `array` may be null.
+    int getNumberFromTxArray(const txArray_tag* array, const std::string& name, const char* text,
+                             unsigned long position);
+
+    /// An expression of some table. The diagnostic belongs to the caller and may be there when it is `ok`.
+    struct CheckedExpr {
+        unsigned long exprId;
+        qlsvDiagnosticImpl* diagnostic;
+        bool ok;
+    };
+    /// Reads dimensions into `exprTable`, simplifies them and leaves out those of 1 at the end, of which two are kept.
+    /// Not ok, with a diagnostic, for what cannot be read, and `DimensionLessThanOne` for a number below 1.
+    CheckedExpr generateExprIdFromExpr(const std::u16string& text, QL::SymbolicExprTable& exprTable) const;
+
+    /// Empties `names`; then the names of the symbols of that expression of this table which has the number that the
+    /// text would have alone in an empty table, when this is a symbolic dimension.
+    void getSymbolicDimensionsFromExpr(const std::u16string& text, std::vector<std::string>& names) const;
+
+    /// A text. The diagnostic belongs to the caller and may be there when it is `ok`.
+    struct CheckedText {
+        std::u16string text;
+        qlsvDiagnosticImpl* diagnostic;
+        bool ok;
+    };
+    /// Checks dimensions as generateExprIdFromExpr, in a table of its own, and gives their text in the host language.
+    /// Not ok, with an empty text, for what that refuses, and `InsufficientNumDimensions` for fewer than `minDims`
+    /// dimensions when that is above 1; what is no list has none then.
+    CheckedText validateSymbolicDimsTExpr(const std::u16string& text, int minDims) const;
 
     // Ids and handles.
 
@@ -200,8 +259,6 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
 
     /// isLossOfSymbolicDimsDiagEnabled() as it answered the first time since the last reset.
     bool lossOfSymbolicDimsDiagEnabled() const;
-
-    using QL::SymbolRegistry::registerSymbolicTExpr;
 
   protected:
     /// Whether a symbol has entered the table by a registration or an import since the last reset.

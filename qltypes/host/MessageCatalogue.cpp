@@ -68,7 +68,7 @@ constexpr CatalogueRow catalogue[] = {
     {"Quillane:SymbolicDims", "NonAsciiDimensionsString", "W", "dimensions '{0}' hold a character that is not ASCII"},
     {"Quillane:SymbolicDims", "DimensionLessThanOne", "SW", "dimension {0} of '{1}' is below 1"},
     {"Quillane:SymbolicDims", "InsufficientNumDimensions", "WL", "dimensions '{0}' are too few: {1} are needed"},
-    {"Quillane:SymbolicDims", "MatrixInterpretedAs1D", "WWSSS", "dimensions '{0}' of '{1}' are read as one dimension: {2}, {3}, {4}"},
+    {"Quillane:SymbolicDims", "MatrixInterpretedAs1D", "WWSSS", "'{0}' of '{1}' has the dimensions {2}, which are not one: make them {3} or {4}"},
 
     {"QuillaneTypes:Dimensions", "InconsistentSymbolicDimensionEqual", "SSS", "{0} cannot be greater than {1}: it is known to equal {2}"},
     {"QuillaneTypes:Dimensions", "InconsistentSymbolicDimensionGreaterThan", "SSS", "{0} cannot be greater than {1}: it is known to be less than {2}"},

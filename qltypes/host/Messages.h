@@ -81,7 +81,7 @@ namespace Quillane::SymbolicDims {
 
 struct DimensionLessThanOne : QLTypeSys::failure::Message { DimensionLessThanOne(const std::string& dimension, const std::u16string& text) : Message("Quillane:SymbolicDims", "DimensionLessThanOne", dimension, text) {} };
 struct InsufficientNumDimensions : QLTypeSys::failure::Message { InsufficientNumDimensions(const std::u16string& text, long numDims) : Message("Quillane:SymbolicDims", "InsufficientNumDimensions", text, numDims) {} };
-struct MatrixInterpretedAs1D : QLTypeSys::failure::Message { MatrixInterpretedAs1D(const std::u16string& text, const std::u16string& shape, const std::string& rows, const std::string& columns, const std::string& width) : Message("Quillane:SymbolicDims", "MatrixInterpretedAs1D", text, shape, rows, columns, width) {} };
+struct MatrixInterpretedAs1D : QLTypeSys::failure::Message { MatrixInterpretedAs1D(const std::u16string& first, const std::u16string& second, const std::string& dims, const std::string& column, const std::string& row) : Message("Quillane:SymbolicDims", "MatrixInterpretedAs1D", first, second, dims, column, row) {} };
 
 } // namespace Quillane::SymbolicDims
 // clang-format on
