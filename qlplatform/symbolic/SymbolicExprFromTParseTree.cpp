@@ -247,10 +247,11 @@ unsigned long SymbolicExprFromTParseTree::visitOperands(SymbolicOp op, std::span
     return areValid ? table_.add(op, std::span(ids).first(operands.size())) : noExpr;
 }
 
-// The minus of a literal belongs to its value.
+// The minus before a literal belongs to its value: -3 is a number, -(3) an operator over one.
 unsigned long SymbolicExprFromTParseTree::visitMinus(Node* node, const char* text) {
     Node* const operand = node->child(0);
-    if (!isNumber(*operand)) return visitOperands(SymbolicOp::UnaryMinus, std::array{operand}, text);
+    if (!isNumber(*operand) || operand->end() != node->end())
+        return visitOperands(SymbolicOp::UnaryMinus, std::array{operand}, text);
     return acceptsNode(operand, text) ? visitNumber(*node, -operand->numberValue(), text) : noExpr;
 }
 

@@ -5,7 +5,8 @@
 //
 // What is read, as doubles or whole numbers of a table:
 //   identifiers                        what resolveSymbol says of them; true, false, Inf, inf, NaN, nan are values
-//   12  0x1F  0b101  1e3  -5           integer values when whole and of 32 bits, double values otherwise
+//   12  0x1F  0b101  1e3  -5           integer values when whole and of 32 bits, double values otherwise; -(5) is an
+//                                      operator over a number
 //   + -  * .*  ^ .^  ' .'  / ./ \ .\   elementwise and matrix operators are one, for all is scalar; ' leaves its
 //   operand < <= > >= == ~=  & && | ||  ~      comparisons and logic abs ceil fix floor not round       calls with one
 //   argument and eq ge gt le lt max min mod     calls with two ne or power rem [a b c]  [a, b, c]  [a; b; c]      a

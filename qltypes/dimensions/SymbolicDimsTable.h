@@ -84,6 +84,10 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
     /// for numbers written otherwise: hexadecimal, octal, behind blanks, out of range.
     DimsRegistration registerSymbolicDims(const char* text, QL::SymbolValidator& validator);
 
+    /// Registers an expression, or a list, in the engine's own syntax (SymbolicExprParser.h), whose symbols get the
+    /// values that `validator` gives them. Id -2 with a diagnostic when the text cannot be read or a value is refused.
+    DimsRegistration registerSymbolicDimsExpr(const char* text, QL::SymbolValidator& validator);
+
     /// Gives each symbol of `id` that has none the value of the validator. Null on success; otherwise what the first
     /// refused value gave.
     qlsvDiagnosticImpl* registerSymbolicIdValues(int id, QL::SymbolValidator& validator);

@@ -7,6 +7,7 @@
 #include "qlplatform/services/Diagnostics.h"
 #include "qlplatform/strings/Strings.h"
 #include "qlplatform/symbolic/SymbolicExpr.h"
+#include "qlplatform/symbolic/SymbolicExprParser.h"
 #include "qlplatform/symbolic/SymbolicExprPrinter.h"
 #include "qlplatform/symbolic/SymbolicExprTranslate.h"
 #include "qltypes/dimensions/DummyValidator.h"
@@ -76,6 +77,16 @@ SymbolicDimsTable::DimsRegistration SymbolicDimsTable::registerSymbolicDims(cons
     if (*end == '\0') return {registerSymbolicDims(boost::lexical_cast<int>(text)), nullptr};
     const int id = SymbolicDimsString(this, text).getId();
     symbolsRegistered_ = true;
+    qlsvDiagnosticImpl* const diagnostic = registerSymbolicIdValues(id, validator);
+    return {diagnostic ? unresolved : id, diagnostic};
+}
+
+SymbolicDimsTable::DimsRegistration SymbolicDimsTable::registerSymbolicDimsExpr(const char* text,
+                                                                                QL::SymbolValidator& validator) {
+    symbolsRegistered_ = true;
+    const auto [exprId, refusal] = QL::SymbolicExprParser(getExprTable(), false, true)(text);
+    if (refusal) return {unresolved, refusal};
+    const int id = symbolicIdOf(exprId);
     qlsvDiagnosticImpl* const diagnostic = registerSymbolicIdValues(id, validator);
     return {diagnostic ? unresolved : id, diagnostic};
 }

@@ -28,6 +28,7 @@ TEST(BinaryInterface, SlotsOfTheTableOfDimensions) {
         slotOf(&Table::reportLossOfSymbolicDimensions),
         slotOf(&Table::isLossOfSymbolicDimsDiagEnabled),
         slotOf(&Table::registerReferencedSymbolInParamTable),
+        slotOf(static_cast<Registry::Registration (Table::*)(const std::string&, const NumericDims&, QL::SymbolValidator&)>(&Table::registerSymbolicTExpr)),
     };
     for (std::size_t i = 0; i < slots.size(); ++i)
         EXPECT_EQ(slots[i], 2 + i) << "operation " << i + 1; // behind the two forms of the destructor

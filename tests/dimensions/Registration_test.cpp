@@ -20,7 +20,6 @@
 #include "qltypes/dimensions/SymbolicDimsTable.h"
 #include "tests/support/FailingNew.h"
 #include "tests/support/Raises.h"
-#include "tests/support/Slots.h"
 
 class QLBlock {};
 
@@ -31,7 +30,6 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testsupport::describe;
 using testsupport::expectedMessage;
-using testsupport::slotOf;
 
 constexpr unsigned long noExpr = QL::SymbolicExprTable::noExpr;
 
@@ -199,6 +197,29 @@ TEST_F(Registration, ValuesOfTheSymbolsOfAnExpression) {
     for (const int none : {-1, 0, -7, 100000})
         EXPECT_EQ(table.registerSymbolicIdValues(none, workspace), nullptr);
     EXPECT_EQ(workspace.asked.size(), 3U);
+}
+
+// ---- The engine's own syntax ----
+
+TEST_F(Registration, ExpressionsInTheEnginesSyntax) {
+    const auto read = [&](const char* text) {
+        const auto [id, diagnostic] = table.registerSymbolicDimsExpr(text, workspace);
+        return withMessages(id == -2 ? "-2" : table.getSymbolicDims(id).toString(), diagnostic);
+    };
+    workspace.set("N", txCreateDoubleScalar(4));
+    workspace.set("bad", txCreateString("text"));
+    EXPECT_FALSE(table.symbolsRegistered());
+    EXPECT_EQ(read("3"), "3");
+    EXPECT_TRUE(table.symbolsRegistered());
+    EXPECT_EQ(read("(2*N + M)/2 % 3"), "(2*N + M)/2 % 3"); // C's form, with divisions, and not simplified
+    EXPECT_EQ(read("[N M+1]"), "[N M + 1]");
+    EXPECT_EQ(read("N != 3 && !(M == 2)"), "N != 3 && !(M == 2)");
+    EXPECT_EQ(read("INHERIT"), "INHERIT");
+    EXPECT_THAT(table.eval(SymbolicDimsString(table, "N").getId()), ElementsAre(4.0));
+    EXPECT_THAT(workspace.asked, ElementsAre("N", "M", "M", "M")); // N has a value since
+    EXPECT_EQ(read("N + bad"), "-2\n" + expectedMessage("Quillane:SymbolicExpr:UnsupportedValue", "bad", "bad", " ^"));
+    EXPECT_EQ(read("N +").substr(0, 45), "-2\nQuillane:SymbolicExpr:UnexpectedToken(3, '");
+    EXPECT_EQ(read("N ~= 3").substr(0, 4), "-2\nQ"); // not the host language's operators
 }
 
 // ---- Texts with numeric dimensions ----
@@ -614,18 +635,6 @@ TEST_F(Registration, MemoryThatRunsOutLeavesNothingBehind) {
             qlsvDiscardDiagnostic(diagnostic);
         if (!wasReached) break;
     }
-}
-
-TEST(RegistrationInterface, Slots) {
-    using Result = QL::SymbolRegistry::Registration;
-    using Walk = SymbolicDimsTable;
-    EXPECT_EQ(slotOf(static_cast<Result (Walk::*)(const std::u16string&, QL::SymbolValidator&, std::vector<double>&)>(
-                  &Walk::registerSymbolicTExpr)),
-              1U + 5U); // behind the two forms of the destructor
-    EXPECT_EQ(slotOf(&Walk::registerReferencedSymbolInParamTable), 1U + 13U);
-    EXPECT_EQ(slotOf(static_cast<Result (Walk::*)(const std::string&, const NumericDims&, QL::SymbolValidator&)>(
-                  &Walk::registerSymbolicTExpr)),
-              1U + 14U);
 }
 
 } // namespace
