@@ -20,6 +20,7 @@ struct DifferenceFound {};
 void addLayoutCommand(CLI::App& app);
 void addTypeCommand(CLI::App& app);
 void addConvertCommand(CLI::App& app);
+void addDimsCommand(CLI::App& app);
 void addTimeCommand(CLI::App& app);
 void addTableCommand(CLI::App& app);
 void addMessagesCommand(CLI::App& app);

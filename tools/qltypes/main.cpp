@@ -25,10 +25,11 @@ int main(int argc, char** argv) {
     CLI::App app("Shows what is in a table of data types, and why it is there.", "qltypes");
     app.set_version_flag("--version", std::string("qltypes ") + QLTypeSys::libraryVersion());
     app.require_subcommand(1);
-    app.footer("Help on a subcommand: qltypes layout --help");
+    app.footer("Help on a subcommand: qltypes SUBCOMMAND --help");
     inspector::addLayoutCommand(app);
     inspector::addTypeCommand(app);
     inspector::addConvertCommand(app);
+    inspector::addDimsCommand(app);
     inspector::addTimeCommand(app);
     inspector::addTableCommand(app);
     inspector::addMessagesCommand(app);
