@@ -5,8 +5,10 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <span>
+#include <utility>
 #include <vector>
 
 #include <boost/container/small_vector.hpp>
@@ -47,6 +49,15 @@ class Polynomial {
 
     /// The polynomial 0.
     Polynomial() = default;
+    Polynomial(const Polynomial&) = default;
+    Polynomial(Polynomial&&) noexcept = default;
+    Polynomial& operator=(const Polynomial&) = default;
+    // Made anew: assigning short vectors by move may allocate, and ends the program when that fails.
+    Polynomial& operator=(Polynomial&& other) noexcept {
+        if (this == &other) return *this;
+        std::destroy_at(this);
+        return *std::construct_at(this, std::move(other));
+    }
     /// A number.
     explicit Polynomial(Integer constant);
     /// An atom.

@@ -2,6 +2,8 @@
 #include <algorithm>
 #include <cstdio>
 #include <map>
+#include <new>
+#include <optional>
 #include <random>
 #include <set>
 
@@ -9,6 +11,7 @@
 
 #include "qlplatform/symbolic/SymbolicExpr.h"
 #include "tests/dimensions/LiteralConstraints.h"
+#include "tests/support/FailingNew.h"
 #include "tests/support/FlagState.h"
 #include "tests/support/Raises.h"
 
@@ -48,7 +51,8 @@ bool isSame(const SymbDimsRange& a, const SymbDimsRange& b) {
 
 class Replay {
   public:
-    explicit Replay(unsigned seed) : random(seed), store(&table), literal(table) {
+    explicit Replay(unsigned seed, bool inShortMemory = false)
+        : random(seed), store(&table), literal(table), memoryFails(inShortMemory) {
         const int numSymbols = 4 + below(7);
         std::vector<int> symbols;
         for (int i = 0; i < numSymbols; ++i)
@@ -95,6 +99,7 @@ class Replay {
 
     int numRefused = 0;
     int numStated = 0;
+    int numOutOfMemory = 0;
 
   private:
     int below(int limit) { return static_cast<int>(random() % static_cast<unsigned>(limit)); }
@@ -115,9 +120,42 @@ class Replay {
     // Does the same on both, and compares what came of it.
     template <class Statement> void both(const std::string& what, const Statement& statement) {
         history += what + "\n";
+        compare(testsupport::raisedBy([&] { statement(store); }), statement);
+    }
+    template <class Statement> void compare(const std::string& outcome, const Statement& statement) {
         const std::string expected = outcomeOf([&] { statement(literal); });
-        EXPECT_EQ(testsupport::raisedBy([&] { statement(store); }), expected) << history;
+        EXPECT_EQ(outcome, expected) << history;
         ++(expected == "nothing thrown" ? numStated : numRefused);
+    }
+
+    // What comes of it on the store when some allocation fails, unless none that failed was needed.
+    template <class Work> std::optional<std::string> outcomeInShortMemory(const Work& work) {
+        std::optional<std::string> outcome;
+        testsupport::failNewAt(1 + random() % 24);
+        try {
+            outcome = testsupport::raisedBy([&] { work(store); });
+        } catch (const std::bad_alloc&) {
+            ++numOutOfMemory;
+        }
+        testsupport::failNewAt(0);
+        return outcome;
+    }
+
+    // Mostly as both. In short memory a statement may be stated on none instead: nothing is changed then but that the
+    // ranges of its sizes may be there, which is why they are made on both beforehand. Not so statements on shapes, of
+    // which the dimensions in front of the failure stay stated.
+    template <class Statement>
+    void bothOrNone(const std::string& what, const std::vector<int>& ids, const Statement& statement) {
+        const bool isOfShapes = std::any_of(ids.begin(), ids.end(), [this](int id) {
+            return table.getSymbolicExpr(static_cast<unsigned long>(id + 1)).getNumDimensions() != 0;
+        });
+        if (!memoryFails || isOfShapes || below(3) != 0) return both(what, statement);
+        for (const int id : ids)
+            both("a range of " + text(id),
+                 [&](auto& s) { s.addGreaterThanValue(id, std::numeric_limits<int>::max(), nullptr); });
+        history += what + " (in short memory)\n";
+        const std::optional<std::string> outcome = outcomeInShortMemory(statement);
+        if (outcome) compare(*outcome, statement);
     }
 
     void state() {
@@ -128,25 +166,33 @@ class Replay {
         std::discrete_distribution<int> kind(std::begin(weights), std::end(weights));
         switch (kind(random)) {
         case 0:
-            return both(of + " == " + text(b), [&](auto& s) { s.addEqual(a, b, block); });
+            return bothOrNone(of + " == " + text(b), {a, b}, [&](auto& s) { s.addEqual(a, b, block); });
         case 1:
-            return both(of + " is " + std::to_string(value), [&](auto& s) { s.addEqualValue(a, value, block); });
+            return bothOrNone(of + " is " + std::to_string(value), {a},
+                              [&](auto& s) { s.addEqualValue(a, value, block); });
         case 2:
-            return both(of + " > " + text(b), [&](auto& s) { s.addGreaterThan(a, b, block); });
+            return bothOrNone(of + " > " + text(b), {a, b}, [&](auto& s) { s.addGreaterThan(a, b, block); });
         case 3:
-            return both(of + " above " + std::to_string(value),
-                        [&](auto& s) { s.addGreaterThanValue(a, value, block); });
+            return bothOrNone(of + " above " + std::to_string(value), {a},
+                              [&](auto& s) { s.addGreaterThanValue(a, value, block); });
         case 4:
-            return both(of + " below " + std::to_string(value), [&](auto& s) { s.addLessThanValue(a, value, block); });
+            return bothOrNone(of + " below " + std::to_string(value), {a},
+                              [&](auto& s) { s.addLessThanValue(a, value, block); });
         default:
             const int max = below(8) == 0 ? anyValue() : std::max(value, anyValue());
             const auto flags = static_cast<GenerateCodeFlags>(below(8));
-            both(of + " in " + std::to_string(value) + " to " + std::to_string(max),
-                 [&](auto& s) { s.addRange(a, value, max, block, flags); });
+            bothOrNone(of + " in " + std::to_string(value) + " to " + std::to_string(max), {a},
+                       [&](auto& s) { s.addRange(a, value, max, block, flags); });
         }
     }
 
     void ask(int a, int b) {
+        if (memoryFails && below(2) == 0)
+            outcomeInShortMemory([&](const SymbolicDimsConstraints& s) {
+                s.getRange(a);
+                s.isEqual(a, b);
+                s.isGreaterThan(a, b);
+            });
         EXPECT_EQ(store.isEqual(a, b), literal.isEqual(a, b)) << history << text(a) << " == " << text(b) << '?';
         EXPECT_EQ(store.isGreaterThan(a, b), literal.isGreaterThan(a, b))
             << history << text(a) << " > " << text(b) << '?';
@@ -230,6 +276,7 @@ class Replay {
     SymbolicDimsTable table;
     SymbolicDimsConstraints store;
     LiteralConstraints literal;
+    const bool memoryFails;
     std::vector<int> pool;
     int weights[6];
     QLBlock blocks[3];
@@ -250,6 +297,18 @@ TEST(ConstraintsReplay, AsTheLiteralStoreDoes) {
     EXPECT_GT(numStated, 50'000);
     EXPECT_GT(numRefused, 20'000);
     std::printf("%d statements held, %d were refused\n", numStated, numRefused);
+}
+
+TEST(ConstraintsReplay, AlsoWhenMemoryFails) {
+    int numOutOfMemory = 0;
+    for (unsigned seed = 1; seed <= 1000; ++seed) {
+        SCOPED_TRACE("seed " + std::to_string(seed));
+        Replay replay(seed, true);
+        replay.run();
+        numOutOfMemory += replay.numOutOfMemory;
+        if (HasFailure()) break;
+    }
+    EXPECT_GT(numOutOfMemory, 2000);
 }
 
 } // namespace
