@@ -1,4 +1,4 @@
-// Slots of virtual operations, which are the binary interface.
+// Slots of virtual operations and order of fields, which are the binary interface.
 #include "qltypes/dimensions/NumericDims.h"
 #include "qltypes/dimensions/SymbolicDimsTable.h"
 #include "tests/support/Slots.h"
@@ -34,6 +34,39 @@ TEST(BinaryInterface, SlotsOfTheTableOfDimensions) {
         EXPECT_EQ(slots[i], 2 + i) << "operation " << i + 1; // behind the two forms of the destructor
 }
 // clang-format on
+
+// Access to private fields: an explicit instantiation may name them.
+template <class Field, auto member> struct Reveal {
+    friend constexpr auto memberOf(Field) { return member; }
+};
+#define QLTYPES_REVEAL(name)                                                                                           \
+    struct Field_##name {                                                                                              \
+        friend constexpr auto memberOf(Field_##name);                                                                  \
+    };                                                                                                                 \
+    template struct Reveal<Field_##name, &SymbolicDimsTable::name>
+QLTYPES_REVEAL(constraints_);
+QLTYPES_REVEAL(displayStrings_);
+QLTYPES_REVEAL(headerFiles_);
+QLTYPES_REVEAL(oneIntExprId_);
+QLTYPES_REVEAL(oneDoubleExprId_);
+QLTYPES_REVEAL(symbolsRegistered_);
+QLTYPES_REVEAL(torvexExprs_);
+QLTYPES_REVEAL(lossOfSymbolicDimsDiag_);
+
+TEST(BinaryInterface, FieldsOfTheTableOfDimensions) {
+    using testsupport::offsetOfMember;
+    EXPECT_EQ(offsetOfMember(memberOf(Field_constraints_())), sizeof(QL::SymbolRegistry)); // the first
+    testsupport::expectAscending({
+        offsetOfMember(memberOf(Field_constraints_())),
+        offsetOfMember(memberOf(Field_displayStrings_())),
+        offsetOfMember(memberOf(Field_headerFiles_())),
+        offsetOfMember(memberOf(Field_oneIntExprId_())),
+        offsetOfMember(memberOf(Field_oneDoubleExprId_())),
+        offsetOfMember(memberOf(Field_symbolsRegistered_())),
+        offsetOfMember(memberOf(Field_torvexExprs_())),
+        offsetOfMember(memberOf(Field_lossOfSymbolicDimsDiag_())),
+    });
+}
 
 TEST(BinaryInterface, SlotsOfNumericDims) {
     EXPECT_EQ(slotOf(&NumericDims::getNumDims), 2u);
