@@ -15,17 +15,17 @@ namespace {
 constexpr const char* category = "Quillane:SymbolicExpr";
 // clang-format off
 constexpr MessageText texts[] = {
-    {category, "UnhandledExpression", "'{0}' has no meaning in a symbolic expression:\n  {1}\n{2}"},
-    {category, "UnsupportedFunction", "'{0}' is no function that symbolic expressions have:\n  {1}\n{2}"},
-    {category, "InvalidNumArguments", "number of arguments of '{0}' is {1} and must be {2}:\n  {3}\n{4}"},
-    {category, "NonScalarValue", "'{0}' is no scalar:\n  {1}\n{2}"},
-    {category, "ComplexValue", "'{0}' is complex:\n  {1}\n{2}"},
-    {category, "UnsupportedDivision", "the division in '{0}' is not supported:\n  {1}\n{2}"},
-    {category, "UnsupportedValue", "the value of '{0}' is no number that a symbol can have:\n  {1}\n{2}"},
-    {category, "NonIntegerValue", "'{0}' is no whole number:\n  {1}\n{2}"},
-    {category, "InvalidLiteral", "literal {0} is no whole number:\n  {1}\n{2}"},
-    {category, "IntegerLiteralOverflow", "literal {0} does not fit 32 bits:\n  {1}\n{2}"},
-    {category, "LogicalValue", "'{0}' is logical:\n  {1}\n{2}"},
+    {category, "UnhandledExpression", "'{0}' has no meaning in a symbolic expression:\n  {1}\n {2}"},
+    {category, "UnsupportedFunction", "'{0}' is no function that symbolic expressions have:\n  {1}\n {2}"},
+    {category, "InvalidNumArguments", "number of arguments of '{0}' is {1} and must be {2}:\n  {3}\n {4}"},
+    {category, "NonScalarValue", "'{0}' is no scalar:\n  {1}\n {2}"},
+    {category, "ComplexValue", "'{0}' is complex:\n  {1}\n {2}"},
+    {category, "UnsupportedDivision", "the division in '{0}' is not supported:\n  {1}\n {2}"},
+    {category, "UnsupportedValue", "the value of '{0}' is no number that a symbol can have:\n  {1}\n {2}"},
+    {category, "NonIntegerValue", "'{0}' is no whole number:\n  {1}\n {2}"},
+    {category, "InvalidLiteral", "literal {0} is no whole number:\n  {1}\n {2}"},
+    {category, "IntegerLiteralOverflow", "literal {0} does not fit 32 bits:\n  {1}\n {2}"},
+    {category, "LogicalValue", "'{0}' is logical:\n  {1}\n {2}"},
     {category, "NonAsciiText", "'{0}' holds a character that is not ASCII"},
 };
 // clang-format on

@@ -12,7 +12,8 @@
 //   InvalidLiteral, IntegerLiteralOverflow          the literal, the expression, marker line
 //   NonAsciiText                                    the expression, wide
 //
-// A marker line is blanks and a caret: it stands under the byte in question of an expression printed behind two blanks.
+// A marker line is a caret behind one blank more than there are bytes before the one in question: with one more blank in
+// front, as the texts print it, the caret stands under that byte of an expression behind two blanks.
 // Nothing is thrown: the walker goes on, and one expression can give several messages, in the order found.
 #pragma once
 

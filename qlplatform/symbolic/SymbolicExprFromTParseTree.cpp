@@ -21,7 +21,7 @@ namespace {
 constexpr unsigned long noExpr = SymbolicExprTable::noExpr;
 
 constexpr MessageText texts[] = {
-    {"Quillane:SymbolicExpr", "InvalidExpression", "this is no expression:\n  {0}\n{1}"},
+    {"Quillane:SymbolicExpr", "InvalidExpression", "this is no expression:\n  {0}\n {1}"},
 };
 const MessageTextTable registeredTexts(texts, std::size(texts));
 

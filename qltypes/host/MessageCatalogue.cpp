@@ -62,11 +62,11 @@ constexpr CatalogueRow catalogue[] = {
     {"Quillane:Data", "Param_UnsupportedLogicalValue", "SS", "parameter '{0}' in '{1}' is logical, which is not supported"},
     {"Quillane:Data", "Param_ComplexValueInExpression", "SS", "parameter '{0}' in '{1}' is complex"},
 
-    {"Quillane:SymbolicDims", "ComplexValue", "SSS", "'{0}' in a dimension is complex:\n  {1}\n{2}"},
-    {"Quillane:SymbolicDims", "NonScalarValue", "SSS", "'{0}' in a dimension is no scalar:\n  {1}\n{2}"},
-    {"Quillane:SymbolicDims", "NonIntegerValue", "SSS", "'{0}' in a dimension is no integer:\n  {1}\n{2}"},
+    {"Quillane:SymbolicDims", "ComplexValue", "SSS", "'{0}' in a dimension is complex:\n  {1}\n {2}"},
+    {"Quillane:SymbolicDims", "NonScalarValue", "SSS", "'{0}' in a dimension is no scalar:\n  {1}\n {2}"},
+    {"Quillane:SymbolicDims", "NonIntegerValue", "SSS", "'{0}' in a dimension is no integer:\n  {1}\n {2}"},
     {"Quillane:SymbolicDims", "NonAsciiDimensionsString", "W", "dimensions '{0}' hold a character that is not ASCII"},
-    {"Quillane:SymbolicDims", "DimensionLessThanOne", "SW", "dimension {0} of '{1}' is below 1"},
+    {"Quillane:SymbolicDims", "DimensionLessThanOne", "SW", "the {0} dimension of '{1}' is below 1"},
     {"Quillane:SymbolicDims", "InsufficientNumDimensions", "WL", "dimensions '{0}' are too few: {1} are needed"},
     {"Quillane:SymbolicDims", "MatrixInterpretedAs1D", "WWSSS", "'{0}' of '{1}' has the dimensions {2}, which are not one: make them {3} or {4}"},
 

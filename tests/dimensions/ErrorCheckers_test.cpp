@@ -1,6 +1,7 @@
 // The checkers of dimensions and of parameters, row by row: an own message, the base's, or nothing.
 #include <functional>
 #include <map>
+#include <sstream>
 
 #include <gtest/gtest.h>
 
@@ -20,7 +21,7 @@ using testsupport::expectedMessage;
 using Checker = QL::QLSymbolicExprErrorChecker;
 
 constexpr const char* text = "2*N/3";
-constexpr const char* marker = "   ^"; // under the byte at 2, behind two blanks
+constexpr const char* marker = "   ^"; // for the byte at 2
 
 // One call of every report, of the second term of `text` or of the whole.
 class ErrorCheckers : public testing::Test {
@@ -142,10 +143,33 @@ TEST_F(ErrorCheckers, TheMarkerStandsUnderTheByte) {
     checker.reportComplexValue("3", text, 4);
     EXPECT_EQ(checker.pending()->text(), "'2' in a dimension is complex:\n"
                                          "  2*N/3\n"
-                                         " ^\n"
+                                         "  ^\n"
                                          "'3' in a dimension is complex:\n"
                                          "  2*N/3\n"
-                                         "     ^");
+                                         "      ^");
+}
+
+// The last two lines of what a message prints: the expression and the caret.
+TEST_F(ErrorCheckers, EveryTextPrintsTheCaretUnderTheByte) {
+    Checker base;
+    QLSymbolicDimsErrorChecker dims;
+    for (const Row& row : rows()) {
+        for (Checker* checker : {&base, static_cast<Checker*>(&dims)}) {
+            checker->clearPending();
+            row.call(*checker);
+            if (!checker->pending() || checker->pending()->item(0).arguments.empty()) continue;
+            SCOPED_TRACE(checker->pending()->text());
+            std::vector<std::string> lines;
+            std::istringstream in(checker->pending()->text());
+            for (std::string line; std::getline(in, line);)
+                lines.push_back(line);
+            ASSERT_EQ(lines.size(), 3u);
+            EXPECT_EQ(lines[1], std::string("  ") + text);
+            const auto& marked = boost::get<std::string>(checker->pending()->item(0).arguments.back());
+            const std::size_t byte = marked == marker ? 2 : marked == " ^" ? 0 : 3;
+            EXPECT_EQ(lines[2], std::string(2 + byte, ' ') + "^");
+        }
+    }
 }
 
 template <class Tested> void expectGathering() {

@@ -229,7 +229,7 @@ TEST_F(SymbolicWalker, TheDivisionOfTheBaseIsReportedAtItsSign) {
     walk.checker.reportDivisionExpr(tree->child(0), "2*N /M");
     EXPECT_EQ(describe(walk.checker.pending()),
               expectedMessage("Quillane:SymbolicExpr:UnsupportedDivision", "2*N /M", "2*N /M", "     ^"));
-    EXPECT_EQ(walk.checker.pending()->text(), "the division in '2*N /M' is not supported:\n  2*N /M\n     ^");
+    EXPECT_EQ(walk.checker.pending()->text(), "the division in '2*N /M' is not supported:\n  2*N /M\n      ^");
     delete_parse_tree(tree);
 }
 
