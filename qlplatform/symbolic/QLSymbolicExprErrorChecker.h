@@ -12,8 +12,9 @@
 //   InvalidLiteral, IntegerLiteralOverflow          the literal, the expression, marker line
 //   NonAsciiText                                    the expression, wide
 //
-// A marker line is a caret behind one blank more than there are bytes before the one in question: with one more blank in
-// front, as the texts print it, the caret stands under that byte of an expression behind two blanks.
+// A marker line is a caret behind one blank more than there are bytes before the one in question. With another blank in
+// front, as the texts have it, the caret stands under that byte of an expression that is printed behind two.
+//
 // Nothing is thrown: the walker goes on, and one expression can give several messages, in the order found.
 #pragma once
 

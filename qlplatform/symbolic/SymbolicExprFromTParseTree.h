@@ -7,10 +7,13 @@
 //   identifiers                        what resolveSymbol says of them; true, false, Inf, inf, NaN, nan are values
 //   12  0x1F  0b101  1e3  -5           integer values when whole and of 32 bits, double values otherwise; -(5) is an
 //                                      operator over a number
-//   + -  * .*  ^ .^  ' .'  / ./ \ .\   elementwise and matrix operators are one, for all is scalar; ' leaves its
-//   operand < <= > >= == ~=  & && | ||  ~      comparisons and logic abs ceil fix floor not round       calls with one
-//   argument and eq ge gt le lt max min mod     calls with two ne or power rem [a b c]  [a, b, c]  [a; b; c]      a
-//   list, as the whole text only; [a] is a
+//   + -  * .*  ^ .^  ' .'  / ./ \ .\   elementwise and matrix operators are one, for all is scalar; ' changes nothing
+//   < <= > >= == ~=  & && | ||  ~      comparisons and logic
+//   abs ceil fix floor not round       calls with one argument
+//   and eq ge gt le lt max min mod     calls with two
+//   ne or power rem                    calls with two
+//   [a b c]  [a, b, c]  [a; b; c]      a list, as the whole text only; [a] is a
+//
 // Everything else, and what the checker is told of besides, is in QLSymbolicExprErrorChecker.h. What cannot be read
 // gives no expression; the rest of the text is still visited, so that all complaints come at once.
 //

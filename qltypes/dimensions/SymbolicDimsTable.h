@@ -81,7 +81,7 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
 
     /// Registers one token: a decimal number of 32 bits, or the name of a symbol with the value that `validator` gives
     /// it. Id -2 with a diagnostic when that value is refused. Throws boost::bad_lexical_cast for the empty token and
-    /// for numbers written otherwise: hexadecimal, octal, behind blanks, out of range.
+    /// for numbers written otherwise: hexadecimal, behind blanks, out of range. 017 is 17.
     DimsRegistration registerSymbolicDims(const char* text, QL::SymbolValidator& validator);
 
     /// Registers an expression, or a list, in the engine's own syntax (SymbolicExprParser.h), whose symbols get the
