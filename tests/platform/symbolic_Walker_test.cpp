@@ -423,6 +423,11 @@ TEST_F(SymbolicWalker, ReportingDiagnostics) {
     qlsvDiscardDiagnostic(taken);
 }
 
+TEST_F(SymbolicWalker, WhatWasPendingIsClearedFirst) {
+    walk.reportDiagnostic(qlsvCreateDiagnosticFromMessageID(resource_core::BaseMsgID("category", "leaf", 0)));
+    EXPECT_EQ(read("N"), "N");
+}
+
 TEST_F(SymbolicWalker, DepthIsTheParsers) {
     const auto nested = [](int levels) {
         std::string text;
