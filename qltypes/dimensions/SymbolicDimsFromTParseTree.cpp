@@ -108,7 +108,7 @@ unsigned long SymbolicDimsFromTParseTree::visitMatrix(const Node& matrix, const 
     if (numRows == 1 && numDims > elements.size()) return noExpr;
     std::vector<char> areSymbolic(elements.size());
     std::ranges::transform(elements, areSymbolic.begin(), [&](Node* element) { return containsSymbol(element, text); });
-    if (numRows == 1 && elements.size() == 1) return areSymbolic[0] ? visitNode(elements[0], text) : noExpr;
+    if (elements.size() == 1) return areSymbolic[0] ? visitNode(elements[0], text) : noExpr;
     if (std::ranges::find(areSymbolic, true) == areSymbolic.end()) return noExpr;
 
     std::vector<unsigned long> entries(elements.size(), noExpr);
