@@ -262,4 +262,20 @@ bool Polynomial::multiplyAtEnd(const Polynomial& younger) {
     return true;
 }
 
+bool Polynomial::squareTerm() {
+    if (terms_.size() != 1) return false;
+    Term& own = terms_[0];
+    const std::span<Factor> factors{factors_.data() + own.firstFactor, own.numFactors};
+    const bool isShort = own.coefficient.numBits() <= limits::coefficientBits / 2;
+    if (!isShort ||
+        std::any_of(factors.begin(), factors.end(), [](const Factor& f) { return f.exponent > limits::exponent / 2; }))
+        return false;
+    if (!own.coefficient.isOne()) own.coefficient *= own.coefficient;
+    for (Factor& f : factors)
+        f.exponent *= 2;
+    if (__builtin_add_overflow(own.degree, own.degree, &own.degree))
+        own.degree = std::numeric_limits<std::uint64_t>::max();
+    return true;
+}
+
 } // namespace QL

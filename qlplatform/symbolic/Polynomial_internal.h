@@ -106,6 +106,10 @@ class Polynomial {
     /// product is beyond the limits.
     bool multiplyAtEnd(const Polynomial& younger);
 
+    /// Squares a single term in place. False, with nothing done, for any other polynomial in order and when the square
+    /// is beyond the limits.
+    bool squareTerm();
+
     /// Divides both by their greatest common divisor and returns it, with a positive leading sign. Beyond the limits
     /// the divisor is common but need not be the greatest. None is 0.
     static Polynomial removeCommonDivisor(Polynomial& a, Polynomial& b);

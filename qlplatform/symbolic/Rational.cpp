@@ -351,6 +351,15 @@ Value RationalArithmetic::multiply(Value a, Value b) {
     return a;
 }
 
+Value RationalArithmetic::square(Value a) {
+    if (a.floating) return multiply(a, a);
+    settle(a);
+    if (!a.denominator.isOne() && !a.denominator.get()->squareTerm())
+        a.denominator = times(a.denominator.polynomial(), a.denominator.polynomial());
+    if (!a.numerator.squareTerm()) a.numerator = times(a.numerator, a.numerator);
+    return a;
+}
+
 // An operator that is not carried out: the expression is an atom.
 Value RationalArithmetic::opaque(SymbolicOp op, Value& a, Value& b) {
     const NodeId left = write(a);

@@ -71,6 +71,8 @@ class RationalArithmetic {
     Value negate(Value a) const;
     Value add(Value a, Value b, bool subtracts);
     Value multiply(Value a, Value b);
+    /// The product of a value with itself, which needs no common divisor.
+    Value square(Value a);
     Value divide(Value a, Value b);
     /// The power with a whole exponent.
     Value power(Value base, std::int64_t exponent);

@@ -265,6 +265,10 @@ Value Simplifier::evaluate(const Entry& entry) {
         return arithmetic_.add(std::move(left), take(store_.operand(id, 1)), op == SymbolicOp::Minus);
     }
     case SymbolicOp::Multiply: {
+        if (store_.operand(id, 0) == store_.operand(id, 1)) {
+            --entryOf(store_.operand(id, 0)).numUses; // two at once
+            return arithmetic_.square(takeFactor(id, store_.operand(id, 0)));
+        }
         Value left = takeFactor(id, store_.operand(id, 0));
         return arithmetic_.multiply(std::move(left), takeFactor(id, store_.operand(id, 1)));
     }

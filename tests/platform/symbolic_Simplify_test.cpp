@@ -260,6 +260,31 @@ TEST_F(SymbolicSimplify, Powers) {
     });
 }
 
+// A product of one expression with itself goes its own way.
+TEST_F(SymbolicSimplify, Squares) {
+    const E quotient = k / (n(2) * l);
+    const E sum = k - l;
+    const E half = d(0.5) * k;
+    const E term = n(-3) * k;
+    expectRows({
+        {k * k, "K*K"},
+        {term * term, "9*K*K"},
+        {sum * sum, "K*K - 2*K*L + L*L"},
+        {quotient * quotient, "K*K/(4*L*L)"},
+        {quotient * quotient * quotient, "K*K*K/(8*L*L*L)"},
+        {quotient * quotient + quotient, "(K*K + 2*K*L)/(4*L*L)"},
+        {(sum / m) * (sum / m), "(K*K - 2*K*L + L*L)/(M*M)"},
+        {(sum * sum - sum * sum) * k, "0"},
+        {n(-7) * n(-7), "49"},
+        {n(65536) * n(65536), "4294967296.0"},
+        {d(0.5) * d(0.5), "0.25"},
+        {half * half, "0.25*K*K"},
+        {power(k, 1 << 30) * power(k, 1 << 30), "pow(K, 2147483648.0)"},
+    });
+    const E highest = make(SymbolicOp::Power, k, number(table, 9007199254740992.0)); // of which no exponent is left
+    expectRows({{highest * highest, "pow(K, 9007199254740992.0)*pow(K, 9007199254740992.0)"}});
+}
+
 TEST_F(SymbolicSimplify, ListsAreSimplifiedInside) {
     EXPECT_EQ(text(simplified(list(table, {k + n(0), n(2) * n(3), l}))), "[K 6 L]");
     EXPECT_EQ(simplified(list(table, {k, l})).id, list(table, {k, l}).id);
