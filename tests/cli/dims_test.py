@@ -34,9 +34,12 @@ class Dims(unittest.TestCase):
         code, out, err = run(EXAMPLE)
         self.assertEqual(code, 1)
         self.assertEqual(out, """\
+register kernels(33, 16) = [taps, bands] -> [taps bands]
+register padded(512, 16) = [frame + taps - 1, 16] -> [frame + taps - 1 16]
 show bank -> [bands ceil((frame + taps - 1)/decimation)]
 simplify (frame*bands + bands*taps - bands)/bands - taps + 1 -> frame
 simplify work/(2*thinned) -> bands
+equal? padded, filtered*16 -> yes
 greater? frame, decimation -> yes
 greater? block_size, decimation -> not known
 equal? channels, bands -> yes
@@ -44,24 +47,24 @@ equal? channels*hop, bank -> yes
 range? frame -> 64 to 4096
 range? taps -> 2 to 128
 list code ->
-  frame == block_size  (by Overlap)
-  ceil((frame + taps - 1)/decimation) == hop  (by Overlap)
   bands == channels  (by Overlap)
-  ceil((frame + taps - 1)/decimation)*bands == channels*hop  (by Overlap)
+  frame == block_size  (by Overlap)
+  ceil((taps + frame - 1)/decimation) == hop  (by Overlap)
+  bands*ceil((taps + frame - 1)/decimation) == channels*hop  (by Overlap)
+  taps > decimation
   frame > taps  (by Decimator)
   frame > 63  (by Source)
-  taps > decimation
   decimation > 1  (by Decimator)
-  frame < 4097  (by Source)
   taps < 129  (by Filter)
+  frame < 4097  (by Source)
   decimation < 2147483647  (by Decimator)
 eval bank -> [16 128]
 eval work -> 4096
 """)
         self.assertEqual(err, f"""\
-{EXAMPLE}:45:1: refused: decimation cannot be greater than frame: it is known to be less than frame
-  contradicts {EXAMPLE}:20:1: greater frame, taps
-  contradicts {EXAMPLE}:22:1: greater taps, decimation
+{EXAMPLE}:50:1: refused: decimation cannot be greater than frame: it is known to be less than frame
+  contradicts {EXAMPLE}:24:1: greater frame, taps
+  contradicts {EXAMPLE}:26:1: greater taps, decimation
 """)
 
     def test_expressions(self):
@@ -88,6 +91,22 @@ eval work -> 4096
         # Names that name each other a hundred thousand times over.
         deep = "let x = K\n" + "let x = x + x*x\n" * 2000 + "bind K = 0\neval x\n"
         self.assertEqual(run(script=deep), (0, "eval x -> 0\n", ""))
+
+    def test_texts_of_the_host_language(self):
+        for statement, answer in (
+                ("register a(480, 640) = [rows, cols]", "[rows cols]"),
+                ("register a(4, 3) = [N+1 3]", "[N + 1 3]"),
+                ("register a(4, 3) = [N^2; 3]", "[pow(N, 2) 3]"),
+                ("register a(4) = [1 4]", "not symbolic"),
+                ("register a(4) = [K L 3]", "K  (without L)  (without 3)"),
+                ("register a() = K", "K"),
+                ("register a(0) = K", "NOSYMBOLIC"),
+                ("register a(3) = 0.5*K", "0.5*K  (literal 0.5 is no whole number)")):
+            with self.subTest(statement):
+                self.assertEqual(run(script=statement), (0, f"{statement} -> {answer}\n", ""))
+        self.assertEqual(answers("let N = 2*M\nregister a(5, 3) = [N+1 3]\nshow a\n")[1:], [
+            {"line": 2, "statement": "register a(5, 3) = [N+1 3]", "expression": "[2*M + 1 3]", "lost": []},
+            {"line": 3, "statement": "show a", "expression": "[2*M + 1 3]", "hostExpression": "[2*M + 1 3]"}])
 
     def test_values(self):
         self.assertEqual(run(script="bind K = 2*3\nbind L = 0.5\neval [K*L K/0]\nbind K = -1\neval K\n"),
@@ -162,6 +181,13 @@ eval work -> 4096
                 ("let 3 = K", "1:5: expected a name, found '3'"),
                 ("let K =", "1:8: expected an operand, found the end of the text"),
                 ("bind K = L", "1:10: expected a number, found 'L'"),
+                ("register a(4, 5) = [1 K/2]", "1:24: the division in 'K/2' is not supported"),
+                ("register a(4, 5) = [K,", "1:23: expected an operand, found the end of the text"),
+                ("register a(4) = 1 + f(K)", "1:21: 'f' is no function that symbolic expressions have"),
+                ("register a(x) = K", "1:12: expected an integer of 32 bits, or * for no bound, found 'x'"),
+                ("register a = K", "1:10: expected register NAME(D, ...) = TEXT"),
+                ("register a(3) x = K", "1:15: expected '=', found 'x'"),
+                ("register 4(3) = K", "1:10: expected a name, found '4'"),
                 ("range K, 1, x", "1:13: expected an integer of 32 bits, or * for no bound, found 'x'"),
                 ("range K, 1, 2147483648", "1:13: expected an integer of 32 bits, or * for no bound,"
                  " found '2147483648'"),

@@ -60,7 +60,8 @@ std::vector<ScriptPart> Facts::contradicted(const Fact& fact) const {
     std::vector<const Fact*> needed;
     for (const Fact& earlier : stated_)
         needed.push_back(&earlier);
-    for (std::size_t length = needed.size(); length > 0; length /= 2) {
+    for (std::size_t length = needed.size(), numBefore = 0; length > 0;) {
+        numBefore = needed.size();
         for (std::size_t i = 0; i < needed.size();) {
             std::vector<const Fact*> others(needed.begin(), needed.begin() + static_cast<std::ptrdiff_t>(i));
             others.insert(others.end(),
@@ -71,6 +72,7 @@ std::vector<ScriptPart> Facts::contradicted(const Fact& fact) const {
             else
                 i += length;
         }
+        if (needed.size() == numBefore) length /= 2;
     }
     std::vector<ScriptPart> statements;
     for (const Fact* earlier : needed)

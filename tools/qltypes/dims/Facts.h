@@ -33,9 +33,10 @@ struct Fact {
 
 /// Why a fact was refused.
 struct Contradiction {
-    std::string message;             ///< the library's
-    std::string identifier;          ///< "category:leaf"
-    std::vector<ScriptPart> against; ///< the fewest earlier statements that make it a contradiction, in their order
+    std::string message;    ///< the library's
+    std::string identifier; ///< "category:leaf"
+    std::vector<ScriptPart>
+        against; ///< earlier statements, in order, that refuse it together and of which none can be left out
 };
 
 class Facts {

@@ -8,7 +8,7 @@ namespace inspector {
 namespace {
 
 // What stands behind a verb.
-enum class Shape { Nothing, Assignment, Name, Operands, Words };
+enum class Shape { Nothing, Assignment, Registration, Name, Operands, Words };
 
 struct VerbRow {
     const char* word;
@@ -24,6 +24,7 @@ struct VerbRow {
 constexpr VerbRow verbs[] = {
     {"let",      Verb::Let,          Shape::Assignment, 1, 1, "let NAME = A",            "NAME stands for A from here on"},
     {"bind",     Verb::Bind,         Shape::Assignment, 1, 1, "bind NAME = NUMBER",      "the value of a symbol, for eval"},
+    {"register", Verb::Register,     Shape::Registration, 1, 0, "register NAME(D, ...) = TEXT", "the same, read from the host language for a signal of these numeric dimensions"},
     {"show",     Verb::Show,         Shape::Operands,   1, 1, "show A",                  "the expression, C-like and in the host language"},
     {"simplify", Verb::Simplify,     Shape::Operands,   1, 1, "simplify A",              "the simplified form"},
     {"eval",     Verb::Eval,         Shape::Operands,   1, 1, "eval A",                  "the value under the bindings"},
@@ -104,6 +105,9 @@ class LineReader {
         case Shape::Assignment:
             readAssignment(statement, rest, row->usage);
             break;
+        case Shape::Registration:
+            readRegistration(statement, rest, row->usage);
+            break;
         case Shape::Words:
             readWords(statement, rest);
             break;
@@ -129,6 +133,20 @@ class LineReader {
         statement.name = part(rest, 0, sign);
         checkName(statement.name);
         statement.operands = {part(rest, sign + 1)};
+    }
+
+    void readRegistration(Statement& statement, const ScriptPart& rest, const char* usage) const {
+        const std::size_t open = rest.text.find('(');
+        const std::size_t close = rest.text.find(')');
+        const std::size_t sign = rest.text.find('=');
+        if (open == std::string::npos || !(open < close && close < sign && sign != std::string::npos))
+            fail(rest, fmt::format("expected {}", usage));
+        if (const ScriptPart between = part(rest, close + 1, sign); !between.text.empty())
+            fail(between, fmt::format("expected '=', found '{}'", between.text));
+        statement.name = part(rest, 0, open);
+        checkName(statement.name);
+        statement.operands = operandsOf(part(rest, open + 1, close));
+        statement.operands.insert(statement.operands.begin(), part(rest, sign + 1));
     }
 
     void readWords(Statement& statement, const ScriptPart& rest) const {
@@ -185,7 +203,7 @@ std::vector<Statement> readScript(const std::string& file, std::string_view text
 std::string statementHelp() {
     std::string text;
     for (const VerbRow& row : verbs)
-        text += fmt::format("  {:<26}{}\n", row.usage, row.meaning);
+        text += fmt::format("  {:<30}{}\n", row.usage, row.meaning);
     return text;
 }
 

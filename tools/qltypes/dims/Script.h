@@ -16,6 +16,7 @@ namespace inspector {
 enum class Verb {
     Let,
     Bind,
+    Register,
     Show,
     Simplify,
     Eval,
@@ -43,8 +44,8 @@ struct ScriptPart {
 struct Statement {
     Verb verb = Verb::Help;
     ScriptPart whole;
-    ScriptPart name; ///< what let, bind and block name
-    std::vector<ScriptPart> operands;
+    ScriptPart name;                  ///< what let, bind, register and block name
+    std::vector<ScriptPart> operands; ///< of register: the text, then the numeric dimensions
 };
 
 /// Where a part of the script `file` stands, or what stands `offset` bytes behind its begin.

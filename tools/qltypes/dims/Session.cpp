@@ -5,10 +5,13 @@
 
 #include <fmt/format.h>
 
+#include "qlplatform/language/ParseTree.h"
 #include "qlplatform/services/Diagnostics.h"
 #include "qlplatform/symbolic/SymbolicExpr.h"
 #include "qlplatform/symbolic/SymbolicExprParser.h"
 #include "qlplatform/symbolic/SymbolicExprSimplify.h"
+#include "qltypes/dimensions/DummyValidator.h"
+#include "qltypes/dimensions/NumericDims.h"
 
 namespace inspector {
 namespace {
@@ -45,6 +48,37 @@ std::string statedBy(const std::vector<const QLBlock*>& blocks) {
 
 ordered_json boundJson(int bound, int open) { return bound == open ? ordered_json() : ordered_json(bound); }
 
+class SignalDims : public QLTypeSys::NumericDims {
+  public:
+    explicit SignalDims(std::vector<long> dims) : dims_(std::move(dims)) {}
+    std::size_t getNumDims() const override { return dims_.size(); }
+    long getDim(std::size_t index) const override { return dims_[index]; }
+
+  private:
+    std::vector<long> dims_;
+};
+
+// Every identifier is a symbol; keeps the dimensions that the signal has no place for.
+class SymbolReader : public QLTypeSys::DummyValidator {
+  public:
+    void reportLossOfSymbolicDimensions(qlsvDiagnosticImpl*&, unsigned long exprId) override { lost.push_back(exprId); }
+    std::vector<unsigned long> lost;
+};
+
+// A message whose further lines show the text, and a line with a mark under the place.
+struct MarkedMessage {
+    std::string text; // without those lines
+    std::size_t position = 0;
+};
+
+MarkedMessage markedMessage(const qlsvDiagnosticImpl& diagnostic) {
+    const std::string whole = diagnostic.text(0);
+    const auto& arguments = diagnostic.item(0).arguments;
+    const std::string* const marker = arguments.empty() ? nullptr : boost::get<std::string>(&arguments.back());
+    const bool isMarker = marker && marker->size() >= 2 && marker->find_first_not_of(' ') == marker->size() - 1;
+    return {whole.substr(0, whole.find(":\n")), isMarker ? marker->size() - 2 : 0};
+}
+
 bool asksGreater(Verb verb) { return verb == Verb::AskGreater || verb == Verb::AskLess; }
 
 } // namespace
@@ -63,6 +97,8 @@ Answer Session::run(const Statement& statement) {
         return let(statement);
     case Verb::Bind:
         return bind(statement);
+    case Verb::Register:
+        return registerText(statement);
     case Verb::Show:
         return show(statement);
     case Verb::Simplify: {
@@ -100,14 +136,17 @@ int Session::read(const ScriptPart& expression) {
     if (const std::size_t zero = expression.text.find('\0'); zero != std::string::npos)
         fail(expression, "found the byte 0x00", zero);
     auto [exprId, diagnostic] = QL::SymbolicExprParser(table_.getExprTable(), false, true)(expression.text.c_str());
-    if (diagnostic) {
-        const long position = boost::get<long>(diagnostic->item(0).arguments[0]);
-        const std::string complaint = diagnostic->text(0);
-        qlsvDiscardDiagnostic(diagnostic);
-        // The place stands in front of the complaint already.
-        fail(expression, complaint.substr(complaint.find(": ") + 2), static_cast<std::size_t>(position));
-    }
+    failForSyntax(expression, diagnostic);
     return idOf(withNamesReplaced(exprId, expression));
+}
+
+// For the message of a parser, if there is one. It begins with the place, which stands in front of complaints already.
+void Session::failForSyntax(const ScriptPart& text, qlsvDiagnosticImpl* diagnostic) const {
+    if (!diagnostic) return;
+    const long position = boost::get<long>(diagnostic->item(0).arguments[0]);
+    const std::string complaint = diagnostic->text(0);
+    qlsvDiscardDiagnostic(diagnostic);
+    fail(text, complaint.substr(complaint.find(": ") + 2), static_cast<std::size_t>(position));
 }
 
 int Session::readSimplified(const ScriptPart& expression) {
@@ -162,6 +201,42 @@ Answer Session::bind(const Statement& statement) {
     else
         fail(statement.operands[0], fmt::format("expected a number, found '{}'", statement.operands[0].text));
     return {};
+}
+
+Answer Session::registerText(const Statement& statement) {
+    const ScriptPart& source = statement.operands[0];
+    std::vector<long> numeric;
+    for (std::size_t i = 1; i < statement.operands.size(); ++i)
+        numeric.push_back(bound(statement.operands[i], lowest));
+    qlsvDiagnosticImpl* refusal = nullptr;
+    delete_parse_tree(generate_parse_tree(source.text, &refusal));
+    failForSyntax(source, refusal);
+    SymbolReader reader;
+    auto [exprId, diagnostic] = table_.registerSymbolicTExpr(source.text, SignalDims(numeric), reader);
+    const MarkedMessage message = diagnostic ? markedMessage(*diagnostic) : MarkedMessage();
+    qlsvDiscardDiagnostic(diagnostic);
+    if (exprId == SymbolicExprTable::noExpr && !message.text.empty()) fail(source, message.text, message.position);
+    Answer answer;
+    if (exprId == SymbolicExprTable::noExpr) {
+        answer.text = "not symbolic";
+        answer.values["expression"] = nullptr;
+    } else {
+        exprId = withNamesReplaced(exprId, source);
+        names_[table_.getExprTable().addSymbol(statement.name.text)] = exprId;
+        answer.text = text(idOf(exprId));
+        answer.values["expression"] = answer.text;
+    }
+    answer.values["lost"] = ordered_json::array();
+    for (const unsigned long lost : reader.lost) {
+        const std::string shown = lost == SymbolicExprTable::noExpr ? "a number" : text(idOf(lost));
+        answer.text += fmt::format("  (without {})", shown);
+        answer.values["lost"].push_back(shown);
+    }
+    if (!message.text.empty()) {
+        answer.text += fmt::format("  ({})", message.text);
+        answer.values["message"] = message.text;
+    }
+    return answer;
 }
 
 Answer Session::show(const Statement& statement) {

@@ -44,6 +44,7 @@ class Session {
 
     Answer let(const Statement& statement);
     Answer bind(const Statement& statement);
+    Answer registerText(const Statement& statement);
     Answer show(const Statement& statement);
     Answer eval(const Statement& statement);
     Answer state(const Statement& statement);
@@ -54,6 +55,7 @@ class Session {
     Answer listBlock(const std::string& name);
     int bound(const ScriptPart& text, int open) const;
     QLTypeSys::GenerateCodeFlags hiddenBounds(const ScriptPart& words) const;
+    void failForSyntax(const ScriptPart& text, qlsvDiagnosticImpl* diagnostic) const;
     [[noreturn]] void fail(const ScriptPart& at, const std::string& complaint, std::size_t offset = 0) const;
 
     std::string file_;
