@@ -32,6 +32,9 @@ void* operator new(std::size_t size) {
 
 void* operator new[](std::size_t size) { return ::operator new(size); }
 
+// Here because memory of this kind is given back through the functions below.
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept { return std::malloc(size != 0 ? size : 1); }
+
 void* operator new[](std::size_t size, const std::nothrow_t&) noexcept {
     constexpr std::size_t terabyte = std::size_t{1} << 40;
     if (size > terabyte || (nothrowCallsLeft != 0 && --nothrowCallsLeft == 0)) return nullptr;
