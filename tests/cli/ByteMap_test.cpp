@@ -70,7 +70,7 @@ void own(std::vector<std::string>& owners, const StructureLayout& structure, con
             const StructureLayout& nested = *all.at(element.cType.name);
             for (std::int64_t i = 0; i < element.size / nested.size; ++i) {
                 own(owners, nested, all, base + element.offset + i * nested.size,
-                    text + (isArray ? "(" + std::to_string(i) + ")." : "."));
+                    text + (element.size > nested.size ? "(" + std::to_string(i) + ")." : "."));
             }
             continue;
         }

@@ -10,6 +10,7 @@
 #include <set>
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include "description/Files.h"
 #include "description/JsonReader.h"
@@ -18,6 +19,7 @@
 #include "output/LayoutJson.h"
 #include "output/LayoutText.h"
 #include "output/Output.h"
+#include "picture/Page.h"
 #include "picture/Svg.h"
 #include "table/ChecksumReader.h"
 #include "table/NodeReader.h"
@@ -110,6 +112,18 @@ long indexOf(const NodeReader& reader, const std::string& node, const std::strin
     return *index;
 }
 
+// What was read, for people: files by their names, folders of messages by those of their packages.
+std::string titleOf(const std::vector<std::string>& inputs) {
+    std::vector<std::string> names;
+    for (const std::string& input : inputs) {
+        std::filesystem::path path = std::filesystem::absolute(input).lexically_normal();
+        if (!path.has_filename()) path = path.parent_path(); // a slash stood at the end
+        if (path.filename() == "msg") path = path.parent_path();
+        names.push_back(input == "-" ? "standard input" : path.filename().string());
+    }
+    return fmt::format("{}", fmt::join(names, ", "));
+}
+
 } // namespace
 
 void addLayoutCommand(CLI::App& app) {
@@ -146,8 +160,9 @@ void addLayoutCommand(CLI::App& app) {
     CLI::Option* const format =
         command
             ->add_option("--format", options->format,
-                         "c: print a C header that asserts every size and offset; svg: draw the bytes as a map")
-            ->check(CLI::IsMember({"c", "svg"}))
+                         "c: print a C header that asserts every size and offset; svg: draw the bytes as a map; html: "
+                         "write a page with tree, byte maps, numberings and types")
+            ->check(CLI::IsMember({"c", "svg", "html"}))
             ->excludes(json)
             ->excludes(node)
             ->excludes(numberings)
@@ -161,6 +176,7 @@ void addLayoutCommand(CLI::App& app) {
         "  qltypes layout types.json --only Outer --node 'y(1).b'\n"
         "  qltypes layout types.json --format c --padding > types.h\n"
         "  qltypes layout types.json --only Outer --format svg > outer.svg\n"
+        "  qltypes layout types.json --format html > types.html\n"
         "  qltypes layout /usr/share/geometry_msgs/msg --only geometry_msgs/Pose\n"
         "  echo '{\"types\": [{\"name\": \"P\", \"elements\": [{\"name\": \"x\", \"type\": \"double\"}]}]}' |"
         " qltypes layout -");
@@ -180,6 +196,7 @@ void addLayoutCommand(CLI::App& app) {
         }
         if (options->withPadding && options->format != "c") throw UsageError("--padding: only with --format c");
         if (options->format == "svg") return print(layoutSvg(layout, all));
+        if (options->format == "html") return print(layoutPage(titleOf(options->inputs), layout, all));
         if (options->format == "c") {
             orderForC(layout, all, table);
             return print(cHeader(layout, options->withPadding));

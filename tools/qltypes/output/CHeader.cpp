@@ -2,14 +2,14 @@
 
 #include <algorithm>
 #include <array>
-#include <functional>
 #include <map>
-#include <numeric>
 #include <set>
 #include <string_view>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
+
+#include "output/ElementText.h"
 
 namespace inspector {
 namespace {
@@ -52,11 +52,6 @@ std::vector<std::string> cNames(std::vector<std::string> names, std::set<std::st
         if (isKept(name)) name = freeName(name, taken);
     }
     return names;
-}
-
-// The product of all counts behind a member's name.
-std::int64_t numValues(const ElementLayout& element) {
-    return std::accumulate(element.dimensions.begin(), element.dimensions.end(), std::int64_t{1}, std::multiplies<>());
 }
 
 std::int64_t roundedUp(std::int64_t offset, std::int64_t alignment) {

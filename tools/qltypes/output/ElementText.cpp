@@ -1,6 +1,8 @@
 #include "output/ElementText.h"
 
 #include <cmath>
+#include <functional>
+#include <numeric>
 #include <vector>
 
 #include <fmt/format.h>
@@ -9,6 +11,10 @@
 namespace inspector {
 
 bool isArray(const ElementLayout& element) { return element.dimensions != std::vector<std::int64_t>{1}; }
+
+std::int64_t numValues(const ElementLayout& element) {
+    return std::accumulate(element.dimensions.begin(), element.dimensions.end(), std::int64_t{1}, std::multiplies<>());
+}
 
 std::string nameWithDimensions(const ElementLayout& element) {
     std::string text = element.name;

@@ -10,6 +10,9 @@ namespace inspector {
 /// Whether the element is anything but one value.
 bool isArray(const ElementLayout& element);
 
+/// The product of the dimensions.
+std::int64_t numValues(const ElementLayout& element);
+
 /// "y[2]", and "x" for one value.
 std::string nameWithDimensions(const ElementLayout& element);
 

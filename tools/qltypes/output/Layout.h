@@ -88,6 +88,7 @@ struct StructureLayout {
 struct OtherType {
     std::string name;
     std::string kind;   ///< "alias", "number", "client", "enumeration", "string", "matrix", "image" or "date-time"
+    TypeKind typeKind = TypeKind::Other;
     std::string target; ///< the label of what an alias stands for
     std::int64_t size = 0;
     std::string storage; ///< of an enumeration: the type that holds its values

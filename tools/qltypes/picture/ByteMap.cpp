@@ -1,8 +1,6 @@
 #include "picture/ByteMap.h"
 
 #include <algorithm>
-#include <functional>
-#include <numeric>
 #include <utility>
 
 #include <fmt/format.h>
@@ -18,10 +16,6 @@ constexpr std::int64_t rowsWanted = 400;   // with nested structures opened
 constexpr std::size_t mostRows = 2000;     // in any case
 constexpr std::int64_t longestArray = 6;   // rows of a leaf that are all shown
 constexpr std::int64_t longestNested = 12; // rows of an array of structures that are all shown
-
-std::int64_t numInstances(const ElementLayout& element) {
-    return std::accumulate(element.dimensions.begin(), element.dimensions.end(), std::int64_t{1}, std::multiplies<>());
-}
 
 std::string joined(const std::string& path, const std::string& name) { return path.empty() ? name : path + "." + name; }
 
@@ -64,7 +58,7 @@ class RowCounter {
     }
 
     Opened openedOf(const ElementLayout& element, const StructureLayout& nested, int levels) {
-        const std::int64_t count = numInstances(element);
+        const std::int64_t count = numValues(element);
         const bool isShort = count <= 2 || count <= longestNested / std::max<std::int64_t>(rows(nested, levels), 1);
         return isShort ? Opened{count, 0} : Opened{1, count - 1};
     }
@@ -121,7 +115,7 @@ class Builder {
         const Opened opened = counter_.openedOf(element, nested, levels_ - depth - 1);
         const std::int64_t offset = base + element.offset;
         for (std::int64_t i = 0; i < opened.numOpened; ++i) {
-            const std::string name = isArray(element) ? fmt::format("{}({})", element.name, i) : element.name;
+            const std::string name = numValues(element) > 1 ? fmt::format("{}({})", element.name, i) : element.name;
             const std::size_t firstRow = map_.rows.size();
             const std::int64_t from = offset + i * nested.size;
             addAll(nested, from, depth + 1, joined(path, name));
@@ -162,7 +156,7 @@ class Builder {
         block.notes = notesOf(element);
         block.offset = base + element.offset;
         block.size = element.size;
-        block.valueSize = element.size / numInstances(element);
+        block.valueSize = element.size / numValues(element);
         addRows(block, element.name);
     }
 

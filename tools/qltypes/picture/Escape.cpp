@@ -1,5 +1,7 @@
 #include "picture/Escape.h"
 
+#include <nlohmann/json.hpp>
+
 #include "qlplatform/strings/Strings.h"
 
 namespace inspector {
@@ -22,6 +24,17 @@ std::string escapedForXml(std::string_view text) {
             escaped += unit;
     }
     return qlsvUtf8FromUtf16(escaped);
+}
+
+std::string jsonForScript(const nlohmann::ordered_json& json) {
+    std::string text;
+    for (const char c : json.dump(-1, ' ', true, nlohmann::ordered_json::error_handler_t::replace)) {
+        if (c == '<')
+            text += "\\u003c"; // signs of markup stand in strings only
+        else
+            text += c;
+    }
+    return text;
 }
 
 } // namespace inspector

@@ -1,7 +1,6 @@
 #include "picture/Svg.h"
 
 #include <algorithm>
-#include <array>
 #include <set>
 #include <utility>
 
@@ -10,6 +9,7 @@
 #include "picture/ByteMap.h"
 #include "picture/Embedded.h"
 #include "picture/Escape.h"
+#include "picture/KindStyle.h"
 #include "qlplatform/strings/Strings.h"
 
 namespace inspector {
@@ -29,28 +29,6 @@ constexpr double typeCharacter = 6.4;
 constexpr double noteHeight = 18;
 
 constexpr std::int64_t cacheLine = 64;
-
-struct KindStyle {
-    TypeKind kind;
-    const char* style; // the class in map.css
-    const char* name;
-};
-
-// clang-format off
-constexpr std::array<KindStyle, 7> kindStyles = {{
-    {TypeKind::Float,       "float",       "floating point"},
-    {TypeKind::Integer,     "integer",     "integer"},
-    {TypeKind::Boolean,     "boolean",     "boolean"},
-    {TypeKind::FixedPoint,  "fixed-point", "fixed point"},
-    {TypeKind::Enumeration, "enumeration", "enumeration"},
-    {TypeKind::Structure,   "structure",   "structure, not opened"},
-    {TypeKind::Other,       "other",       "any other type"},
-}};
-// clang-format on
-
-const char* styleOf(TypeKind kind) {
-    return std::find_if(kindStyles.begin(), kindStyles.end(), [&](auto& row) { return row.kind == kind; })->style;
-}
 
 std::size_t numCharacters(const std::string& text) { return qlsvUtf16FromUtf8(text).size(); }
 
@@ -176,7 +154,7 @@ class MapWriter {
 
     void drawBlock(const MapBlock& block) {
         const MapSpan& span = block.span;
-        const char* const style = block.isPadding ? "padding" : styleOf(block.kind);
+        const char* const style = block.isPadding ? "padding" : styleOf(block.kind).style;
         std::string about = fmt::format("{}{}{}\noffset {}, {}", block.path, block.type.empty() ? "" : ": ", block.type,
                                         block.offset, plural(block.size, "byte"));
         if (!block.notes.empty()) about += "\n" + block.notes;
@@ -365,7 +343,7 @@ std::string layoutSvg(const Layout& shown, const Layout& all) {
     const StructuresByName byName = structuresByName(all);
     std::string body;
     Legend legend;
-    double width = 0;
+    double width = 400; // of a legend alone
     double y = margin;
     for (const StructureLayout& structure : shown.structures) {
         MapWriter writer(structure, byName);

@@ -259,7 +259,9 @@ OtherType TypeLoader::otherType(const std::string& name, const char* kind) const
     OtherType type;
     type.name = name;
     type.kind = kind;
-    type.size = DtGetDataTypeSize(&table_, table_.getDataTypeId(name.c_str()));
+    const int id = table_.getDataTypeId(name.c_str());
+    type.typeKind = kindOf(table_, id);
+    type.size = DtGetDataTypeSize(&table_, id);
     return type;
 }
 
