@@ -19,7 +19,8 @@ isThere() {
     case $1 in
     g++) has c++ ;;
     ninja-build) has ninja ;;
-    cmake | git | python3 | pkg-config | file) has "$1" ;;
+    cmake | git | python3 | pkg-config | file | chromium) has "$1" ;;
+    chromium-driver) has chromedriver ;;
     clang) has clang++ ;;
     dpkg-dev) has dpkg-shlibdeps ;;
     python3-*) python3 -c "import ${1#python3-}" 2>/dev/null ;;
