@@ -43,6 +43,17 @@ class Dims : public NumericDims {
     std::vector<long> dims_;
 };
 
+// Puts a message behind a diagnostic; leaves nothing behind when there is no memory for it.
+void extend(qlsvDiagnosticImpl*& diagnostic, const char* category) {
+    qlsvDiagnosticImpl* made = qlsvCreateDiagnosticFromMessageID(resource_core::BaseMsgID(category, "lost", 0));
+    try {
+        qlsvConcatenateDiagnosticsNoCheck(diagnostic, made, false);
+    } catch (const std::bad_alloc&) {
+        qlsvDiscardDiagnostic(made);
+        throw;
+    }
+}
+
 // Identifiers are symbols; some have values, some are nothing.
 class Workspace : public QL::SymbolValidator {
   public:
@@ -55,10 +66,7 @@ class Workspace : public QL::SymbolValidator {
     using SymbolValidator::resolveSymbol;
     void reportLossOfSymbolicDimensions(qlsvDiagnosticImpl*& diagnostic, unsigned long exprId) override {
         lost.push_back(exprId);
-        if (complains) {
-            qlsvDiagnosticImpl* made = qlsvCreateDiagnosticFromMessageID(resource_core::BaseMsgID("test", "lost", 0));
-            qlsvConcatenateDiagnosticsNoCheck(diagnostic, made, false);
-        }
+        if (complains) extend(diagnostic, "test");
     }
     void set(const std::string& name, txArray_tag* value) { records[name] = {{value, txDestroyArray}, name}; }
 
@@ -74,8 +82,7 @@ class Table : public SymbolicDimsTable {
   public:
     void reportLossOfSymbolicDimensions(qlsvDiagnosticImpl*& diagnostic, int id) override {
         lost.push_back(id);
-        qlsvDiagnosticImpl* made = qlsvCreateDiagnosticFromMessageID(resource_core::BaseMsgID("table", "lost", 0));
-        qlsvConcatenateDiagnosticsNoCheck(diagnostic, made, false);
+        extend(diagnostic, "table");
     }
     bool isLossOfSymbolicDimsDiagEnabled() const override { return isEnabled; }
     using SymbolicDimsTable::symbolsRegistered;
