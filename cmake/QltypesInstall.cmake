@@ -66,3 +66,24 @@ foreach(name qltypes qlplatform)
   install(FILES "${PROJECT_BINARY_DIR}/cmake/${name}.pc" DESTINATION "${CMAKE_INSTALL_LIBDIR}/pkgconfig"
           COMPONENT development)
 endforeach()
+
+# gdb reads a script whose path is that of the library behind its own folder of scripts; which one that is follows from
+# the prefix of the installation. The script finds the printers from where it lies.
+if(BUILD_SHARED_LIBS)
+  install(FILES "${PROJECT_SOURCE_DIR}/tools/gdb/qltypes_gdb.py" DESTINATION "${CMAKE_INSTALL_DATADIR}/qltypes"
+          COMPONENT runtime)
+  install(
+    CODE "
+    set(LIBRARY \"$<TARGET_FILE_NAME:qltypes>\")
+    cmake_path(ABSOLUTE_PATH CMAKE_INSTALL_PREFIX NORMALIZE OUTPUT_VARIABLE prefix)
+    set(libraries \"${CMAKE_INSTALL_LIBDIR}\")
+    cmake_path(ABSOLUTE_PATH libraries BASE_DIRECTORY \"\${prefix}\" NORMALIZE)
+    set(shared \"${CMAKE_INSTALL_DATADIR}\")
+    cmake_path(ABSOLUTE_PATH shared BASE_DIRECTORY \"\${prefix}\" NORMALIZE)
+    set(folder \"\${shared}/gdb/auto-load\${libraries}\")
+    file(RELATIVE_PATH DISTANCE \"\${folder}\" \"\${shared}/qltypes\")
+    set(script \"${PROJECT_BINARY_DIR}/gdb/\${LIBRARY}-gdb.py\")
+    configure_file(\"${PROJECT_SOURCE_DIR}/tools/gdb/autoload.py.in\" \"\${script}\" @ONLY)
+    file(INSTALL \"\${script}\" DESTINATION \"\${folder}\")"
+    COMPONENT runtime)
+endif()
