@@ -67,11 +67,12 @@ foreach(name qltypes qlplatform)
           COMPONENT development)
 endforeach()
 
-# gdb reads a script whose path is that of the library behind its own folder of scripts; which one that is follows from
-# the prefix of the installation. The script finds the printers from where it lies.
+# Printers for gdb, to be read with `source`; those of a shared library are read by gdb itself, which looks for a script
+# whose path is that of the library behind its own folder of scripts. Which one that is follows from the prefix of the
+# installation; the script finds the printers from where it lies.
+install(FILES "${PROJECT_SOURCE_DIR}/tools/gdb/qltypes_gdb.py" DESTINATION "${CMAKE_INSTALL_DATADIR}/qltypes/gdb"
+        COMPONENT development)
 if(BUILD_SHARED_LIBS)
-  install(FILES "${PROJECT_SOURCE_DIR}/tools/gdb/qltypes_gdb.py" DESTINATION "${CMAKE_INSTALL_DATADIR}/qltypes"
-          COMPONENT runtime)
   install(
     CODE "
     set(LIBRARY \"$<TARGET_FILE_NAME:qltypes>\")
@@ -81,9 +82,9 @@ if(BUILD_SHARED_LIBS)
     set(shared \"${CMAKE_INSTALL_DATADIR}\")
     cmake_path(ABSOLUTE_PATH shared BASE_DIRECTORY \"\${prefix}\" NORMALIZE)
     set(folder \"\${shared}/gdb/auto-load\${libraries}\")
-    file(RELATIVE_PATH DISTANCE \"\${folder}\" \"\${shared}/qltypes\")
+    file(RELATIVE_PATH DISTANCE \"\${folder}\" \"\${shared}/qltypes/gdb\")
     set(script \"${PROJECT_BINARY_DIR}/gdb/\${LIBRARY}-gdb.py\")
     configure_file(\"${PROJECT_SOURCE_DIR}/tools/gdb/autoload.py.in\" \"\${script}\" @ONLY)
     file(INSTALL \"\${script}\" DESTINATION \"\${folder}\")"
-    COMPONENT runtime)
+    COMPONENT development)
 endif()

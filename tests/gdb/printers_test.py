@@ -87,7 +87,7 @@ class AutoLoad(unittest.TestCase):
         cmake, build, folder = INSTALLATION
         shutil.rmtree(folder, ignore_errors=True)
         self.prefix = pathlib.Path(folder)
-        subprocess.run([cmake, "--install", build, "--prefix", folder, "--component", "runtime"], check=True, capture_output=True)
+        subprocess.run([cmake, "--install", build, "--prefix", folder], check=True, capture_output=True)
         self.library = next(path for path in self.prefix.rglob("libqltypes.so.*.*") if path.suffix != ".py")
 
     def look(self, autoload):

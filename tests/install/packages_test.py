@@ -17,7 +17,8 @@ RUNTIME, DEVELOPMENT, TOOLS = f"libqltypes{major}", "libqltypes-dev", "qltypes"
 LIBRARY = re.escape(library_folder)
 # Which package has a file whose path below /usr matches; the first pattern that matches counts.
 HOME = ((rf"{LIBRARY}/lib\w+\.so\.", RUNTIME), (rf"{LIBRARY}/lib\w+\.so$", DEVELOPMENT), (r"include/", DEVELOPMENT),
-        (rf"{LIBRARY}/(cmake|pkgconfig)/", DEVELOPMENT), (r"bin/|share/qltypes/", TOOLS))
+        (rf"{LIBRARY}/(cmake|pkgconfig)/", DEVELOPMENT), (r"share/(qltypes/)?gdb/", DEVELOPMENT),
+        (r"bin/|share/qltypes/", TOOLS))
 
 
 def run(*command):
@@ -25,7 +26,9 @@ def run(*command):
 
 
 def files_below(folder):
-    return {path.relative_to(folder).as_posix() for path in folder.rglob("*") if path.is_symlink() or path.is_file()}
+    """Paths; of the script that gdb reads, the one part that follows from the prefix is left out."""
+    paths = (path.relative_to(folder).as_posix() for path in folder.rglob("*") if path.is_symlink() or path.is_file())
+    return {re.sub(r"(share/gdb/auto-load/).*/", r"\1", path) for path in paths}
 
 
 shutil.rmtree(work, ignore_errors=True)
