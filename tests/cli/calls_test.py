@@ -315,6 +315,27 @@ Messages that cannot be expressed
         self.assertBad("qltypes: --only: demo_msgs/Nothing cannot be expressed: it has no fields",
                        "layout", self.folder / "demo_msgs/msg", "--only", "demo_msgs/Nothing")
 
+    def test_dimension_facts(self):
+        facts = self.write("facts.dims", "block Filter\ngreater frame, taps\nequal frame, size\nrange? taps\n")
+        self.assertEqual(run("layout", OUTER, facts), (0, OUTER_TEXT.replace("2 structures", f"""\
+Known of dimensions: {facts}
+  fact           stated by
+  frame == size  Filter
+  frame > taps   Filter
+
+2 structures"""), ""))
+        self.assertEqual(json.loads(run("layout", OUTER, facts, "--json")[1])["dimensions"], [
+            {"source": str(facts), "facts": [{"expression": "frame == size", "blocks": ["Filter"]},
+                                             {"expression": "frame > taps", "blocks": ["Filter"]}]}])
+        self.assertNotIn("dimensions", json.loads(run("layout", OUTER, "--json")[1]))
+        for text, complaint in (("greater a, b\ngreater b, a\n", "2:1: refused: b cannot be greater than a"),
+                                ("greater a,\n", "1:"), ("grater a, b\n", "1:1: there is no statement 'grater'")):
+            with self.subTest(text=text):
+                bad = self.write("bad.dims", text)
+                code, out, said = run("layout", OUTER, bad)
+                self.assertEqual((code, out, said.count("\n")), (2, "", 1))
+                self.assertTrue(said.startswith(f"{bad}:{complaint}"), said)
+
     def test_real_messages(self):
         folders = [f"/usr/share/{package}_msgs/msg" for package in ("std", "geometry", "sensor", "nav")]
         code, out, _ = run("layout", *folders)

@@ -73,7 +73,7 @@ class Page(unittest.TestCase):
 
     def test_nothing_but_the_file_is_needed(self):
         page = run(ROOT / "examples/drive.json", "--format", "html")
-        self.assertEqual(re.findall(r"https?:", page), [])
+        self.assertEqual(set(re.findall(r"https?:[^\"]*", page)), {"http://www.w3.org/2000/svg"})  # a name
         self.assertIn("default-src 'none'", page)
         self.open((ROOT / "examples/drive.json",))
         self.assertEqual(self.browser.run("return performance.getEntriesByType('resource').length"), 0)
@@ -203,6 +203,25 @@ class Page(unittest.TestCase):
         self.assertEqual(self.visible()[:2], ["Row", "sfix32_En20"])
         self.open(GRID, "#Cell", "--only", "Row")  # what is nested is there all the same
         self.assertEqual(self.browser.text("#name"), "Cell")
+
+    def test_dimension_facts(self):
+        facts = self.folder / "facts.dims"
+        facts.write_text("block A.b\ngreater frame, taps\ngreater taps, hop\ngreater frame, hop\nequal frame, size\n"
+                         "range taps, 2, 128\nequal bands, channels\nrange? taps\n")
+        self.open((ROOT / "examples/outer.json", facts))
+        self.browser.click("#tab-dimensions")
+        boxes = self.browser.run("""return Object.fromEntries([...document.querySelectorAll('.graph .box')].map((box) =>
+            [[...box.querySelectorAll('text')].map((each) => each.textContent).join(' '), box.getBoundingClientRect().top]))""")
+        self.assertEqual(sorted(boxes, key=boxes.get), ["frameat least 2 size", "taps2 to 128", "hop"])
+        arrows = self.browser.run("return [...document.querySelectorAll('.arrow')].map((each) => each.textContent)")
+        self.assertEqual(sorted(arrows), [f"{fact}, stated by A.b" for fact in ("frame > hop", "frame > taps", "taps > hop")])
+        self.assertEqual([text.split() for text in self.browser.texts("#dimensions .loose .box")], [["bands", "channels"]])
+        self.assertIn(["frame > taps", "A.b"], [row.split("\t") for row in self.browser.texts("#dimensions tbody tr")])
+        self.open((facts,))
+        self.assertEqual(self.browser.text("#name"), "Dimension facts")
+        self.assertEqual(len(self.browser.texts(".arrow")), 3)
+        self.open((ROOT / "examples/outer.json",))
+        self.assertTrue(self.browser.run("return document.querySelector('#tab-dimensions').hidden"))
 
     def test_names_and_texts_cannot_become_markup(self):
         self.open(GRID, "#Cell:level")

@@ -34,8 +34,15 @@ void append(Description& description, Description&& more) {
     description.numMessages += more.numMessages;
 }
 
-// Reads all inputs: JSON descriptions, standard input as one, message definitions and folders of these.
-Description readInputs(const std::vector<std::string>& inputs) {
+struct Inputs {
+    Description description;
+    std::vector<KnownFacts> knownFacts;
+};
+
+// Reads all inputs: JSON descriptions, standard input as one, message definitions and folders of these, scripts of
+// dims.
+Inputs readInputs(const std::vector<std::string>& inputs) {
+    std::vector<KnownFacts> knownFacts;
     Description description;
     MsgReader messages;
     bool hasMessages = false;
@@ -47,6 +54,8 @@ Description readInputs(const std::vector<std::string>& inputs) {
         } else if (std::filesystem::is_directory(path, error)) {
             messages.addFolder(path);
             hasMessages = true;
+        } else if (path.extension() == ".dims") {
+            knownFacts.push_back(readKnownFacts(input, readFileText(path)));
         } else if (path.extension() == ".msg") {
             messages.addFile(path);
             hasMessages = true;
@@ -55,7 +64,7 @@ Description readInputs(const std::vector<std::string>& inputs) {
         }
     }
     if (hasMessages) append(description, messages.read());
-    return description;
+    return {std::move(description), std::move(knownFacts)};
 }
 
 std::string whyAbsent(const Layout& layout, const std::string& name) {
@@ -141,8 +150,10 @@ void addLayoutCommand(CLI::App& app) {
     CLI::App* const command =
         app.add_subcommand("layout", "Lays structures out and shows where each element lies, and why");
     command
-        ->add_option("INPUT", options->inputs,
-                     "JSON type descriptions (- is standard input), .msg files, folders of .msg files")
+        ->add_option(
+            "INPUT", options->inputs,
+            "JSON type descriptions (- is standard input), .msg files, folders of .msg files, and .dims scripts of "
+            "what is known of symbolic dimensions")
         ->required();
     command->add_option("--only", options->only, "Show only these structures, names divided by commas")->delimiter(',');
     CLI::Option* const numberings =
@@ -176,16 +187,17 @@ void addLayoutCommand(CLI::App& app) {
         "  qltypes layout types.json --only Outer --node 'y(1).b'\n"
         "  qltypes layout types.json --format c --padding > types.h\n"
         "  qltypes layout types.json --only Outer --format svg > outer.svg\n"
-        "  qltypes layout types.json --format html > types.html\n"
+        "  qltypes layout types.json facts.dims --format html > types.html\n"
         "  qltypes layout /usr/share/geometry_msgs/msg --only geometry_msgs/Pose\n"
         "  echo '{\"types\": [{\"name\": \"P\", \"elements\": [{\"name\": \"x\", \"type\": \"double\"}]}]}' |"
         " qltypes layout -");
     command->callback([options] {
-        const Description description = readInputs(options->inputs);
+        const auto [description, knownFacts] = readInputs(options->inputs);
         QLTypeSys::DataTypeTable table;
         TypeLoader loader(table);
         loader.load(description);
-        const Layout all = loader.layout(description);
+        Layout all = loader.layout(description);
+        all.knownFacts = knownFacts;
         Layout layout = all;
         if (!options->only.empty()) select(layout, options->only);
         if (options->node) {

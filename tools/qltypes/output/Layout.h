@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "description/Description.h"
+#include "dims/KnownFacts.h"
 
 namespace inspector {
 
@@ -87,7 +88,7 @@ struct StructureLayout {
 /// A type that is no structure and not built in.
 struct OtherType {
     std::string name;
-    std::string kind;   ///< "alias", "number", "client", "enumeration", "string", "matrix", "image" or "date-time"
+    std::string kind; ///< "alias", "number", "client", "enumeration", "string", "matrix", "image" or "date-time"
     TypeKind typeKind = TypeKind::Other;
     std::string target; ///< the label of what an alias stands for
     std::int64_t size = 0;
@@ -100,6 +101,7 @@ struct Layout {
     std::vector<StructureLayout> structures;
     std::vector<Refusal> refusals;
     std::size_t numMessages = 0;
+    std::vector<KnownFacts> knownFacts; ///< of symbolic dimensions, one for each script
 };
 
 } // namespace inspector

@@ -101,10 +101,16 @@ Json refusalJson(const Refusal& refusal) {
             {"place", toText(refusal.place)}};
 }
 
+Json factsJson(const KnownFacts& known) {
+    return {{"source", known.source}, {"facts", arrayOf(known.facts, [](const KnownFacts::Fact& fact) {
+                                           return Json{{"expression", fact.expression}, {"blocks", fact.blocks}};
+                                       })}};
+}
+
 } // namespace
 
 std::string layoutJson(const Layout& layout) {
-    const Json json = {
+    Json json = {
         {"types", arrayOf(layout.otherTypes, otherTypeJson)},
         {"structures", arrayOf(layout.structures, structureJson)},
         {"refused", arrayOf(layout.refusals, refusalJson)},
@@ -113,6 +119,7 @@ std::string layoutJson(const Layout& layout) {
           {"numStructures", layout.structures.size()},
           {"numRefused", layout.refusals.size()}}},
     };
+    if (!layout.knownFacts.empty()) json["dimensions"] = arrayOf(layout.knownFacts, factsJson);
     return json.dump(2) + "\n";
 }
 

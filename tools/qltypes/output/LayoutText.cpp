@@ -79,6 +79,13 @@ std::string otherTypesText(const std::vector<OtherType>& types, const Colours& c
     return fmt::format("{}\n{}\n", colours.bold("Types that are no structures"), table.text("  ", colours));
 }
 
+std::string factsText(const KnownFacts& known, const Colours& colours) {
+    TextTable table({{"fact", Align::Left}, {"stated by", Align::Left}});
+    for (const KnownFacts::Fact& fact : known.facts)
+        table.addRow({fact.expression, fmt::format("{}", fmt::join(fact.blocks, ", "))});
+    return fmt::format("{}\n{}\n", colours.bold("Known of dimensions: " + known.source), table.text("  ", colours));
+}
+
 std::string refusalsText(const std::vector<Refusal>& refusals, const Colours& colours) {
     TextTable table({{"message", Align::Left}, {"why", Align::Left}});
     for (const Refusal& refusal : refusals)
@@ -119,6 +126,8 @@ std::string layoutText(const Layout& layout, bool isSelection, const Colours& co
         if (!structure.nodes.empty()) text += nodesText(structure, colours);
         if (structure.checksum) text += checksumText(structure, colours);
     }
+    for (const KnownFacts& known : layout.knownFacts)
+        text += factsText(known, colours);
     if (!isSelection && !layout.refusals.empty()) text += refusalsText(layout.refusals, colours);
     return text + summaryText(layout);
 }

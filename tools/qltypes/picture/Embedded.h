@@ -15,6 +15,7 @@ std::string_view pageModel();
 std::string_view pageList();
 std::string_view pageTree();
 std::string_view pageMap();
+std::string_view pageGraph();
 std::string_view pageScript();
 
 } // namespace inspector

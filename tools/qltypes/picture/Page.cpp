@@ -18,7 +18,7 @@ void put(std::string& page, std::string_view mark, std::string_view text) {
 
 std::string scripts() {
     std::string text;
-    for (const std::string_view part : {pageModel(), pageList(), pageTree(), pageMap(), pageScript()})
+    for (const std::string_view part : {pageModel(), pageList(), pageTree(), pageMap(), pageGraph(), pageScript()})
         text += part;
     return text;
 }

@@ -131,6 +131,23 @@ std::string summaryOf(const Layout& shown) {
     return text;
 }
 
+Json factsJson(const KnownFacts& known) {
+    Json facts = Json::array();
+    for (const KnownFacts::Fact& fact : known.facts)
+        facts.push_back({{"expression", fact.expression}, {"blocks", fact.blocks}});
+    Json nodes = Json::array();
+    for (const FactGraph::Node& node : known.graph.nodes)
+        nodes.push_back({{"name", node.name}, {"bounds", node.bounds}});
+    Json greater = Json::array();
+    for (const FactGraph::Greater& fact : known.graph.greater)
+        greater.push_back({{"greater", fact.greater}, {"smaller", fact.smaller}, {"blocks", fact.blocks}});
+    return {{"source", known.source},
+            {"facts", facts},
+            {"nodes", nodes},
+            {"classes", known.graph.classes},
+            {"greater", greater}};
+}
+
 } // namespace
 
 nlohmann::ordered_json pageData(const std::string& title, const Layout& shown, const Layout& all) {
@@ -144,6 +161,8 @@ nlohmann::ordered_json pageData(const std::string& title, const Layout& shown, c
     for (const Refusal& refusal : shown.refusals)
         json["refused"].push_back(
             {{"name", refusal.label}, {"reason", refusal.reason}, {"place", toText(refusal.place)}});
+    for (const KnownFacts& known : all.knownFacts)
+        json["dimensions"].push_back(factsJson(known));
     return json;
 }
 

@@ -5,7 +5,7 @@ const byId = (id) => document.getElementById(id);
 const model = new Model(JSON.parse(byId("data").textContent));
 
 const tabs = ["map", "numbers", "types", "dimensions"];
-let chosen = null; // {structure, depthFirst}, {type} or {refusal}
+let chosen = null; // {structure, depthFirst}, {type}, {refusal} or {isFacts}
 let tab = "map";
 let tabOfNodes = "map"; // to go back to from a type
 
@@ -150,6 +150,12 @@ function showType({type}) {
     byId("types").replaceChildren(...parts);
 }
 
+/** What one script states: the graph, and all facts in a table. */
+function factsSection(known) {
+    const rows = known.facts.map(({expression, blocks}) => [expression, blocks.join(", ")]);
+    return [make("h3", "", known.source), drawGraph(known), table(["fact", "stated by"], rows)];
+}
+
 function linkToTarget(label) {
     const type = model.types.find((each) => each.label === label);
     return type ? linkToType(type) : label;
@@ -165,7 +171,7 @@ function choose(choice) {
     const wasNode = chosen === null || chosen.structure !== undefined;
     chosen = choice;
     byId("tab-map").hidden = byId("tab-numbers").hidden = !isNode;
-    byId("tab-types").hidden = choice.refusal !== undefined;
+    byId("tab-types").hidden = !isNode && choice.type === undefined;
     byId("tab-types").textContent = isNode ? "Types used" : "Type";
     if (isNode) {
         tree.show(choice.structure, choice.depthFirst);
@@ -177,10 +183,12 @@ function choose(choice) {
         tree.chosen = choice;
         tree.list.refresh();
         if (choice.type) showType(choice);
-        else showRefusal(choice);
-        setHash([choice.type ? choice.type.label : choice.refusal.name]);
+        else if (choice.refusal) showRefusal(choice);
+        else setFacts("Dimension facts", "", []);
+        if (choice.type) setHash([choice.type.label]);
         if (wasNode) tabOfNodes = tab;
-        if (tab !== "dimensions") setTab("types");
+        if (choice.isFacts) setTab("dimensions");
+        else if (tab !== "dimensions") setTab("types");
     }
 }
 
@@ -207,6 +215,7 @@ function chooseFromHash() {
     if (model.shown.length > 0) return choose({structure: model.structures[model.shown[0]], depthFirst: 0});
     const first = model.types.find((each) => each.isDescribed);
     if (first) choose({type: first});
+    else if (model.data.dimensions) choose({isFacts: true});
     else if (model.data.refused.length > 0) choose({refusal: model.data.refused[0]});
 }
 
@@ -281,6 +290,7 @@ document.title = `${model.data.title} \u2013 qltypes`;
 byId("title").textContent = model.data.title;
 byId("summary").textContent = model.data.summary;
 byId("tab-dimensions").hidden = !model.data.dimensions;
+byId("dimensions").append(...(model.data.dimensions ?? []).flatMap(factsSection));
 setTab("map");
 chooseFromHash();
 window.addEventListener("hashchange", chooseFromHash);
