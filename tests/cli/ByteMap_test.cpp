@@ -5,6 +5,7 @@
 #include <vector>
 
 #include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
 
 #include "description/Description.h"
 #include "picture/ByteMap.h"
@@ -194,6 +195,13 @@ TEST(Escape, MarkupControlsAndBadBytes) {
     EXPECT_EQ(escapedForXml("</script><a b=\"'&\">"), "&lt;/script&gt;&lt;a b=&quot;'&amp;&quot;&gt;");
     EXPECT_EQ(escapedForXml(std::string("a\0\x1b\tb\xff", 6)), "a\ufffd\ufffd\tb\ufffd");
     EXPECT_EQ(escapedForXml("\u00b5m \U0001f697"), "\u00b5m \U0001f697");
+}
+
+TEST(Escape, JsonInsideAScript) {
+    const nlohmann::ordered_json json = {{"</script>", "<!--<script>\xff\u2028\u00b5"}};
+    const std::string text = jsonForScript(json);
+    EXPECT_EQ(text, "{\"\\u003c/script>\":\"\\u003c!--\\u003cscript>\\ufffd\\u2028\\u00b5\"}");
+    EXPECT_EQ(nlohmann::json::parse(text).begin().key(), "</script>");
 }
 
 // Readers let identifiers through only; a picture does not count on it.

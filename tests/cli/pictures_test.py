@@ -161,6 +161,20 @@ class Pictures(unittest.TestCase):
                     with self.subTest(ground=ground, text=text):
                         self.assertGreaterEqual(contrast(colours[ground], colours[text]), 4.5)
 
+    def test_contrast_of_the_page(self):
+        style = (ROOT / "tools/qltypes/picture/page/page.css").read_text()
+        light, dark = re.findall(r":root \{([^}]*)\}", style)
+        grounds = ("ground", "panel", "chosen", "float", "integer", "boolean", "fixed-point", "enumeration", "structure",
+                   "other", "nest", "mark")
+        for scheme in (light, dark):
+            colours = dict(re.findall(r"--([\w-]+): (#[0-9a-f]{6})", scheme))
+            for ground in grounds:
+                for text in ("text",) if ground == "mark" else ("text", "dim"):
+                    with self.subTest(ground=ground, text=text):
+                        self.assertGreaterEqual(contrast(colours[ground], colours[text]), 4.5)
+            for ground in ("ground", "panel"):
+                self.assertGreaterEqual(contrast(colours[ground], colours["accent"]), 4.5)
+
     def test_bad_calls(self):
         outer = ROOT / "examples/outer.json"
         for arguments in (["--format", "svg", "--json"], ["--format", "svg", "--numberings"],

@@ -13,32 +13,50 @@ function draw(tag, attributes, ...children) {
     return element;
 }
 
-/** Boxes with their levels: each lies below all that exceed it. Greater-than has no cycles. */
+/**
+ * Boxes with their levels, each below all that exceed it, and arrows from box to box by way of the levels between. There
+ * they have places of their own, which are in the list of boxes too. Greater-than has no cycles.
+ */
 function boxesOf(known) {
     const boxes = known.classes.map((members) => {
         const lines = members.map((index) => known.nodes[index]);
         const widest = Math.max(...lines.map(({name, bounds}) => name.length + (bounds ? bounds.length + 2 : 0)));
-        return {lines, width: Math.max(64, widest * 7.4 + 24), height: lines.length * lineHeight + 14, above: [], below: []};
+        return {lines, width: Math.max(64, widest * 7.4 + 24), height: lines.length * lineHeight + 14, above: [], below: [], level: 0};
     });
     const boxOf = [];
     known.classes.forEach((members, index) => members.forEach((node) => (boxOf[node] = boxes[index])));
-    const arrows = known.greater.map(({greater, smaller, blocks}) => ({from: boxOf[greater], to: boxOf[smaller], blocks}));
-    for (const {from, to} of arrows) {
-        from.below.push(to);
-        to.above.push(from);
-    }
-    const waiting = boxes.filter((box) => box.above.length === 0);
-    for (const box of waiting) box.level = 0;
-    const left = new Map(boxes.map((box) => [box, box.above.length]));
-    while (waiting.length > 0) {
-        const box = waiting.shift();
-        for (const next of box.below) {
-            next.level = Math.max(next.level ?? 0, box.level + 1);
-            left.set(next, left.get(next) - 1);
-            if (left.get(next) === 0) waiting.push(next);
+    const arrows = known.greater.map(({greater, smaller, blocks}) => ({way: [boxOf[greater], boxOf[smaller]], blocks}));
+    setLevels(boxes, arrows);
+    for (const {way} of arrows) {
+        const [from, to] = way;
+        for (let level = from.level + 1; level < to.level; ++level) {
+            const stop = {lines: [], width: 4, height: 0, above: [], below: [], level};
+            boxes.push(stop);
+            way.splice(-1, 0, stop);
+        }
+        for (let i = 1; i < way.length; ++i) {
+            way[i - 1].below.push(way[i]);
+            way[i].above.push(way[i - 1]);
         }
     }
     return {boxes, arrows};
+}
+
+function setLevels(boxes, arrows) {
+    const numAbove = new Map(boxes.map((box) => [box, 0]));
+    const below = new Map(boxes.map((box) => [box, []]));
+    for (const {way: [from, to]} of arrows) {
+        below.get(from).push(to);
+        numAbove.set(to, numAbove.get(to) + 1);
+    }
+    const waiting = boxes.filter((box) => numAbove.get(box) === 0);
+    for (const box of waiting) { // grows while it is walked
+        for (const next of below.get(box)) {
+            next.level = Math.max(next.level, box.level + 1);
+            numAbove.set(next, numAbove.get(next) - 1);
+            if (numAbove.get(next) === 0) waiting.push(next);
+        }
+    }
 }
 
 /** Orders each level by what its boxes are tied to, and places all. Returns the size of the whole. */
@@ -57,12 +75,12 @@ function place(boxes) {
     let y = 1;
     for (const level of levels) {
         let x = 1 + (width - widthOf(level)) / 2;
+        const bottom = y + Math.max(...level.map((box) => box.height));
         for (const box of level) {
-            box.x = x;
-            box.y = y;
+            Object.assign(box, {x, y, bottom: box.lines.length > 0 ? y + box.height : bottom});
             x += box.width + boxGap;
         }
-        y += Math.max(...level.map((box) => box.height)) + levelGap;
+        y = bottom + levelGap;
     }
     return {width: width + 2, height: y - levelGap + 1};
 }
@@ -83,27 +101,25 @@ function drawGraph(known) {
 }
 
 function drawTied(boxes, arrows) {
-    const {width: ofBoxes, height} = place(boxes);
-    const width = ofBoxes + boxGap; // for arrows that go around boxes
+    const {width, height} = place(boxes);
     const picture = draw("svg", {class: "graph", width, height, viewBox: `0 0 ${width} ${height}`, role: "img",
         "aria-label": "greater sizes stand above smaller ones"},
     draw("defs", {}, draw("marker", {id: "tip", viewBox: "0 0 8 8", refX: 8, refY: 4, markerWidth: 8, markerHeight: 8,
         orient: "auto"}, draw("path", {d: "M0 0L8 4L0 8Z", class: "tip"}))));
-    for (const {from, to, blocks} of arrows) {
-        const [x, y] = [from.x + from.width / 2, from.y + from.height];
-        const [endX, endY] = [to.x + to.width / 2, to.y];
-        const bend = (endY - y) / 2;
-        // Around the boxes of the levels between: a curve goes three quarters of the way to its control points.
-        const between = boxes.filter((box) => box.level > from.level && box.level < to.level);
-        const right = Math.max(...between.map((box) => box.x + box.width)) + boxGap / 2;
-        const [first, second] = between.length === 0 ? [x, endX] : [x, endX].map((end) => end + ((right - end) * 4) / 3);
-        const path = draw("path", {d: `M${x} ${y}C${first} ${y + bend} ${second} ${endY - bend} ${endX} ${endY}`, class: "arrow",
-            "marker-end": "url(#tip)"});
-        const names = `${from.lines[0].name} > ${to.lines[0].name}${blocks.length > 0 ? `, stated by ${blocks.join(", ")}` : ""}`;
-        path.append(draw("title", {}, names));
+    const middle = (box) => box.x + box.width / 2;
+    for (const {way, blocks} of arrows) {
+        let line = `M${middle(way[0])} ${way[0].y}`;
+        for (let i = 1; i < way.length; ++i) {
+            const [from, to] = [way[i - 1], way[i]];
+            const half = (from.bottom + to.y) / 2;
+            line += `V${from.bottom}C${middle(from)} ${half} ${middle(to)} ${half} ${middle(to)} ${to.y}`;
+        }
+        const path = draw("path", {d: line, class: "arrow", "marker-end": "url(#tip)"});
+        const [greater, smaller] = [way[0], way.at(-1)].map(({lines}) => lines[0].name);
+        path.append(draw("title", {}, `${greater} > ${smaller}${blocks.length > 0 ? `, stated by ${blocks.join(", ")}` : ""}`));
         picture.append(path);
     }
-    for (const box of boxes) {
+    for (const box of boxes.filter(({lines}) => lines.length > 0)) {
         const group = draw("g", {class: "box"}, draw("rect", {x: box.x, y: box.y, width: box.width, height: box.height, rx: 6}));
         box.lines.forEach(({name, bounds}, index) => {
             const line = draw("text", {x: box.x + 12, y: box.y + 20 + index * lineHeight}, name);
