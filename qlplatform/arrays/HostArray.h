@@ -67,7 +67,9 @@ QL_EXPORT bool txIsTemporary(const txArray_tag* array);
 /// Number of arrays that exist in the process. For leak tests; unlocked.
 QL_EXPORT std::size_t txGetNumLiveArrays();
 
+/// Gives up the reference that a txArrayPtr owns.
 struct txArrayDeleter {
+    /// Gives up one reference; null is allowed.
     void operator()(txArray_tag* array) const { txDestroyArray(array); }
 };
 
@@ -109,8 +111,11 @@ QL_EXPORT txClassID txGetClassID(const txArray_tag* array);
 QL_EXPORT const char* txGetClassName(const txArray_tag* array);
 
 // Sizes are 0 for null.
+/// Number of rows; 0 for null.
 QL_EXPORT std::size_t txGetNumRows(const txArray_tag* array);
+/// Number of columns; 0 for null.
 QL_EXPORT std::size_t txGetNumColumns(const txArray_tag* array);
+/// Rows by columns; 0 for null.
 QL_EXPORT std::size_t txGetNumberOfElements(const txArray_tag* array);
 
 /// Whether the elements have imaginary parts; false for null and for what is not numeric.

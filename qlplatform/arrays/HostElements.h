@@ -57,6 +57,7 @@ template <class T> txArray_tag* txCreateRow(std::span<const T> values) {
     std::copy(values.begin(), values.end(), txGetWritableElements<T>(row).begin());
     return row;
 }
+/// The same from a list in braces.
 template <class T> txArray_tag* txCreateRow(std::initializer_list<T> values) {
     return txCreateRow(std::span<const T>(values.begin(), values.size()));
 }

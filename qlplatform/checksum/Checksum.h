@@ -14,8 +14,10 @@
 
 /// A checksum: four 32-bit words.
 struct qlChecksumValue {
+    /// The words, first to last.
     std::array<std::uint32_t, 4> words{};
 
+    /// Whether all words are equal.
     bool operator==(const qlChecksumValue&) const = default;
 };
 
@@ -24,6 +26,7 @@ class QL_EXPORT ut_md5ChecksumRec {
   public:
     ut_md5ChecksumRec();
     ut_md5ChecksumRec(const ut_md5ChecksumRec& other);
+    /// Goes on from what `other` has added so far.
     ut_md5ChecksumRec& operator=(const ut_md5ChecksumRec& other);
     ~ut_md5ChecksumRec();
 

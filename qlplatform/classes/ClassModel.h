@@ -47,7 +47,9 @@ class COSInterfacePtr {
     COSInterfacePtr(std::nullptr_t) {}
     template <class T> COSInterfacePtr(std::shared_ptr<T> object) : object_(std::move(object)) {}
 
+    /// The interface, or null; owned by the handles.
     operator COSInterface*() const { return object_.get(); }
+    /// The interface. Unchecked: it must not be null.
     COSInterface* operator->() const { return object_.get(); }
 
   private:
@@ -58,6 +60,7 @@ class COSInterfacePtr {
 class QL_EXPORT ENoElements : public std::exception {
   public:
     ~ENoElements() override;
+    /// Says that there is no element.
     const char* what() const noexcept override;
 };
 
@@ -65,7 +68,9 @@ class QL_EXPORT ENoElements : public std::exception {
 template <class T> class COSSequence {
   public:
     virtual ~COSSequence() = default;
+    /// Whether there is an element that was not read yet.
     virtual bool hasMoreElements() const = 0;
+    /// The next element. Asked only while there is one.
     virtual T nextElement() = 0;
 };
 
@@ -113,8 +118,11 @@ class Interned {
     /// The empty identifier.
     Interned() = default;
 
+    /// The name; good for the life of the process.
     const char* text() const { return text_; }
+    /// Whether the name is empty.
     bool isEmpty() const { return *text_ == '\0'; }
+    /// Whether the names are equal, by their addresses.
     bool operator==(const Interned& other) const { return text_ == other.text_; }
 
   private:
@@ -125,6 +133,7 @@ class Interned {
     const char* text_ = emptyText;
 };
 
+/// The interned form of a name, which is stored when it is new.
 QL_EXPORT Interned makeInterned(const std::string& name);
 
 } // namespace internal
@@ -135,6 +144,7 @@ class QL_EXPORT COSClass : public COSInterface {
     ~COSClass() override;
     COSClass* asClass() override { return this; }
 
+    /// Whether the class is an enumeration; false here.
     virtual bool isEnumeration() const { return false; }
 
     /// The name by which the class is found. Owned by the class.
@@ -159,6 +169,7 @@ class QL_EXPORT COSEnum : public COSInterface {
     ~COSEnum() override;
     COSEnum* asEnum() override { return this; }
 
+    /// The name of the member. Owned by the member.
     virtual const char* getName() const = 0;
 
     /// The value: a scalar number, or a scalar object of the class over one. The caller owns it.
@@ -170,6 +181,7 @@ class QL_EXPORT COSPackage : public COSInterface {
   public:
     explicit COSPackage(std::string name) : name_(std::move(name)) {}
     ~COSPackage() override;
+    /// The name of the package.
     const std::string& getName() const { return name_; }
 
   private:

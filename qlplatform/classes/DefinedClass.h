@@ -11,6 +11,7 @@
 
 namespace tcos {
 
+/// Whether a class has members to choose from.
 enum class ClassKind { plain, enumeration };
 
 /// A class that is filled in by its maker. Changing it while someone walks its lists is not allowed.
@@ -19,7 +20,9 @@ class QL_EXPORT DefinedClass : public COSClass {
     DefinedClass(std::string name, ClassKind kind);
     ~DefinedClass() override;
 
+    /// Appends a superclass.
     DefinedClass& derivesFrom(std::string superclass);
+    /// Puts the class into a package.
     DefinedClass& insidePackage(std::string package);
 
     /// A member whose value is of the integer class that the class derives from first, else int32. The value must fit.

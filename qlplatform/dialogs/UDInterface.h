@@ -37,6 +37,7 @@ class StringVector {
     /// Appends a copy of a NUL-terminated text; null is kept as null.
     void addElement(const char* text) { elements_.push_back(text ? std::optional<std::string>(text) : std::nullopt); }
 
+    /// Number of texts, null ones included.
     std::size_t size() const { return elements_.size(); }
 
     /// Owned by the list; good until the list changes. Unchecked: `index` must be below size().

@@ -128,8 +128,11 @@ template <class Char> class _T_parse_tree_T;
 /// A node of the tree of an expression. Nodes, and the views that they return, are good until the tree is deleted.
 template <> class QL_EXPORT _T_parse_tree_T<char> {
   public:
+    /// Whether the node is a token: it has no operator and no children.
     bool isTerminal() const { return operatorCode_ == ParseOperator::none; }
+    /// What the node does; `none` for a terminal.
     ParseOperator operatorCode() const { return operatorCode_; }
+    /// The token of a terminal, or the sign of an operator.
     ParseToken tokenCode() const { return tokenCode_; }
 
     /// Where the node's own token begins: a terminal's first byte, an operator's sign, the opening bracket of an index,
@@ -139,11 +142,13 @@ template <> class QL_EXPORT _T_parse_tree_T<char> {
     /// The bytes that the node takes in, begin() to before end(): without parentheses around it, with those around its
     /// children. The goal: the whole text.
     std::size_t begin() const { return begin_; }
+    /// Behind the last byte that the node takes in.
     std::size_t end() const { return end_; }
 
     /// The bytes from begin() to end().
     std::string_view text() const { return source_.substr(begin_, end_ - begin_); }
 
+    /// Number of children; 0 for a terminal.
     std::size_t numChildren() const { return children_.size(); }
 
     /// Unchecked: `i` must be below numChildren().

@@ -27,8 +27,11 @@ class QL_EXPORT BaseMsgID {
     /// "category:leaf".
     std::string identifier() const { return category + ":" + leaf; }
 
+    /// The arguments, in the order of the {n} slots of the text.
     std::vector<MsgArgument> arguments;
+    /// What the message is about, such as "QuillaneTypes:general".
     std::string category;
+    /// Which message of the category it is.
     std::string leaf;
 };
 

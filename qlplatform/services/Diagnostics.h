@@ -18,6 +18,7 @@
 /// A diagnostic: a list of messages, read by index. Whoever receives a pointer to one discards it.
 class QL_EXPORT qlsvDiagnosticImpl {
   public:
+    /// Number of messages, 1 or more.
     std::size_t numItems() const { return items_.size(); }
 
     /// The message at `index`. Unchecked: `index` must be below numItems().

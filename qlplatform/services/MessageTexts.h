@@ -12,8 +12,11 @@
 
 /// One registered text. All pointers have static storage.
 struct MessageText {
+    /// The category of the message.
     const char* category;
+    /// The leaf of the message.
     const char* leaf;
+    /// The English text, with {0}, {1} ... where the arguments go.
     const char* text;
 };
 

@@ -19,6 +19,7 @@ QL_EXPORT std::string qlsv_dtoa_fitools(double value);
 
 /// What number reading needs beside the text. Made on first use, kept for the life of the process, never changed.
 class utFpcContext;
+/// The context of this process; never null.
 QL_EXPORT const utFpcContext* utGetFpcContext();
 
 /// What ut_strtod says of a text.

@@ -11,17 +11,22 @@
 
 /// One name with its value.
 struct EnumStr {
+    /// The name. Not owned.
     const char* name;
+    /// The value.
     std::int32_t value;
     std::int32_t flag = 0; ///< 1: hidden, not offered in menus; look-ups find it all the same
 };
 
 /// A table of `count` entries, which stay where they are; 0 or less is an empty table.
 struct EnumStrs {
+    /// Number of entries.
     std::int32_t count;
+    /// The first of `count` entries. Not owned.
     const EnumStr* entries;
 };
 
+/// The table under the name that the functions use.
 using utEnumStrs = EnumStrs;
 
 /// The name of the first entry with that value; the empty text when there is none.

@@ -21,6 +21,7 @@ namespace QL {
 
 class SymbolValidator;
 
+/// Registers texts as expressions of a table that it owns. Engines derive their own.
 class QL_EXPORT SymbolRegistry {
   public:
     /// An expression id, and a diagnostic that is null on success.
@@ -53,10 +54,13 @@ class QL_EXPORT SymbolRegistry {
 
     /// The expression table, owned by the registry. Unchecked: it exists at all times but inside a reset.
     SymbolicExprTable& getExprTable() const { return *exprTable_; }
+    /// Whether there is an expression table: always but inside a reset.
     bool hasExprTable() const { return exprTable_ != nullptr; }
 
   protected:
+    /// Deletes the expression table. makeExprTable() must follow before the registry is used.
     void dropExprTable();
+    /// Makes an empty expression table.
     void makeExprTable();
 
   private:

@@ -28,16 +28,20 @@ class QL_EXPORT SymbolicExpr {
         return id_;
     }
 
+    /// The operator, or what kind of terminal it is.
     SymbolicOp getOp() const;
 
     /// Whether it has no operands: a symbol or a value, or a list of no dimensions.
     bool isTerminal() const { return getNumOperands() == 0; }
 
+    /// Number of operands; 0 for a terminal.
     std::size_t getNumOperands() const;
 
     /// The id of an operand. Unchecked: `index` must be below getNumOperands().
     unsigned long getOperand(std::size_t index) const;
+    /// The id of the first operand. Unchecked: there must be one.
     unsigned long getLeft() const { return getOperand(0); }
+    /// The id of the second operand. Unchecked: there must be one.
     unsigned long getRight() const { return getOperand(1); }
 
     /// Number of dimensions of a list; 0 for every other expression.
@@ -108,6 +112,7 @@ template <SymbolicOp op> class SymbolicBinaryExpr : public SymbolicExpr {
         : SymbolicExpr(table, table.add(op, left, right)) {}
 };
 
+// Operators by name: each makes the expression of one operator over the operands that it is given.
 using SymbolicUnaryMinusExpr = SymbolicUnaryExpr<SymbolicOp::UnaryMinus>;
 using SymbolicPlusExpr = SymbolicBinaryExpr<SymbolicOp::Plus>;
 using SymbolicMinusExpr = SymbolicBinaryExpr<SymbolicOp::Minus>;

@@ -6,6 +6,7 @@
 
 namespace QL {
 
+/// Copies expressions from one table to another. Keeps the addresses of both tables.
 class QL_EXPORT SymbolicExprCopy {
   public:
     SymbolicExprCopy(const SymbolicExprTable& from, SymbolicExprTable& to) : from_(from), to_(to) {}

@@ -11,6 +11,7 @@
 
 namespace QL {
 
+/// Evaluates expressions of a table. Keeps the address of the table.
 class QL_EXPORT SymbolicExprEval {
   public:
     explicit SymbolicExprEval(const SymbolicExprTable& table) : table_(table) {}

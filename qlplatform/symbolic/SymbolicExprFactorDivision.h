@@ -6,6 +6,7 @@
 
 namespace QL {
 
+/// Brings divisions to the top of expressions of a table. Keeps the address of the table.
 class QL_EXPORT SymbolicExprFactorDivision {
   public:
     explicit SymbolicExprFactorDivision(SymbolicExprTable& table) : table_(table) {}

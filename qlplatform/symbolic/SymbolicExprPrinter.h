@@ -34,11 +34,13 @@ class QL_EXPORT SymbolicExprAliasPrinterPredicate : public SymbolicExprPrinterPr
     const SymbolicExprTable& table_;
 };
 
+/// Prints expressions of a table.
 class QL_EXPORT SymbolicExprPrinter {
   public:
     /// Prints symbols by their names.
     class QL_EXPORT Predicate : public SymbolicExprPrinterPredicate {
       public:
+        /// The one object of this class.
         static const Predicate& instance();
         std::string identifier(const SymbolicExprTable& table, unsigned long symbolId) const override;
     };
@@ -57,6 +59,7 @@ class QL_EXPORT SymbolicExprPrinter {
     SymbolicExprPrinter(const SymbolicExprTable& table, const SymbolicExprPrinterPredicate& predicate,
                         bool hostOperators, bool hostNumbers, bool hostFunctions, Cache cache);
 
+    /// The text of an expression of the table.
     std::string operator()(const SymbolicExpr& expr);
 
   private:

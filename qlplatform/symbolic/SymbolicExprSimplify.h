@@ -14,6 +14,7 @@
 
 namespace QL {
 
+/// Simplifies expressions of a table. Keeps the address of the table.
 class QL_EXPORT SymbolicExprSimplify {
   public:
     /// `numPasses` and `variantKeywords` are accepted for engines that rewrite in passes and know such keywords; this

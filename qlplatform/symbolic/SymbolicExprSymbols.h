@@ -9,6 +9,7 @@
 
 namespace QL {
 
+/// Lists the symbols of expressions of a table. Keeps the address of the table.
 class QL_EXPORT SymbolicExprSymbols {
   public:
     explicit SymbolicExprSymbols(const SymbolicExprTable& table) : table_(table) {}

@@ -46,6 +46,7 @@ class QL_EXPORT SymbolicExprTable {
     /// Number of expressions; their ids run from 0 to one below it.
     unsigned long getNumExprs() const;
 
+    /// What symbols of this table stand for.
     SymbolDomain getDomain() const;
 
     /// The expression of an id. Unchecked: `exprId` must be below getNumExprs().
@@ -54,8 +55,11 @@ class QL_EXPORT SymbolicExprTable {
     /// The id of a symbol, an integer, a double, a truth value. Adds the entry when it is new. All NaNs are one entry,
     /// and so are 0.0 and -0.0.
     unsigned long addSymbol(const std::string& name);
+    /// The id of an integer value, which is added when it is new.
     unsigned long addInt(int value);
+    /// The id of a double value, which is added when it is new.
     unsigned long addDouble(double value);
+    /// The id of a truth value, which is added when it is new.
     unsigned long addBool(bool value);
 
     /// The id of an operator over operands, which are ids of this table. Adds the entry when it is new.
@@ -74,6 +78,7 @@ class QL_EXPORT SymbolicExprTable {
 
     /// The expression that a symbol is bound to, or an id for which isUnsetValue holds.
     unsigned long getValueId(unsigned long symbolId) const;
+    /// Whether getValueId() answered that the symbol is bound to nothing.
     static bool isUnsetValue(unsigned long valueId) { return valueId == noExpr; }
 
     /// Empties `ids` and lists all expressions of that operator, oldest first. Visits the whole table.
@@ -84,6 +89,7 @@ class QL_EXPORT SymbolicExprTable {
 
     /// For the operations of this folder.
     NodeStore& nodes() const { return *nodes_; }
+    /// For the operations of this folder.
     Simplifier& simplifier() const { return *simplifier_; }
 
   private:

@@ -23,6 +23,7 @@ class QL_EXPORT DateTimeDataType : public DataType {
     /// Ignored: the type is given at construction.
     void setProperties(const void* properties) override;
 
+    /// The time system with its storage.
     const QLDateTime::DateTimeType& getDateTimeType() const { return type_; }
 
   private:

@@ -40,8 +40,11 @@ struct QL_EXPORT DateTimeStruct {
     bool isEqual(const DateTimeStruct& other) const;
     /// Whether the first field that differs is the lower one here, from the year down to the fraction.
     bool isEarlierThan(const DateTimeStruct& other) const;
+    /// Whether this is not later than `other`, by the same order.
     bool isEarlierThanOrEqual(const DateTimeStruct& other) const;
+    /// Whether `other` is earlier, by the same order.
     bool isLaterThan(const DateTimeStruct& other) const;
+    /// Whether this is not earlier than `other`, by the same order.
     bool isLaterThanOrEqual(const DateTimeStruct& other) const;
 
     /// Year-month-day: the year unpadded with its sign, month and day with two digits at least.

@@ -24,8 +24,11 @@ class QL_EXPORT DateTimeType : public TimeSystem {
     /// The system in the default storage of its scale.
     explicit DateTimeType(const TimeSystem& system);
 
+    /// The system in the given storage, which is not checked.
     DateTimeType(const TimeSystem& system, const fxpDataTypeProp& storage);
+    /// Copies system and storage.
     DateTimeType(const DateTimeType&) = default;
+    /// Copies system and storage.
     DateTimeType& operator=(const DateTimeType&) = default;
     ~DateTimeType() override;
 
@@ -39,6 +42,7 @@ class QL_EXPORT DateTimeType : public TimeSystem {
                                    const std::pair<DateTimeStruct, DateTimeStruct>& range,
                                    const fxpDataTypeProp& storage);
 
+    /// The number type in which values are stored.
     const fxpDataTypeProp& getStorage() const { return storage_; }
 
     /// The text of the system; when the storage is not the default of the scale, then "s" where it is signed, the word

@@ -37,7 +37,9 @@ class QL_EXPORT TimeSystem {
     TimeSystem(const AbsoluteTimeScale& scale, const DateTimeStruct& epoch,
                const std::pair<DateTimeStruct, DateTimeStruct>& range);
 
+    /// Copies scale, epoch and range.
     TimeSystem(const TimeSystem&) = default;
+    /// Copies scale, epoch and range.
     TimeSystem& operator=(const TimeSystem&) = default;
     virtual ~TimeSystem();
 
@@ -45,6 +47,7 @@ class QL_EXPORT TimeSystem {
     static TimeSystem createTimeSystem(const AbsoluteTimeScale& scale, const DateTimeStruct& epoch,
                                        const std::pair<DateTimeStruct, DateTimeStruct>& range);
 
+    // Defaults: the scale with the epoch and the range that belong to it.
     static TimeSystem getDefaultTAI();
     static TimeSystem getDefaultGPS();
     static TimeSystem getDefaultUTC();
@@ -52,8 +55,11 @@ class QL_EXPORT TimeSystem {
     static TimeSystem getDefaultJD_TAI();
     static TimeSystem getDefaultMJD_TAI();
 
+    /// The scale.
     AbsoluteTimeScale getTimeScale() const { return scale_; }
+    /// The moment that values are counted from.
     const DateTimeStruct& getEpoch() const { return epoch_; }
+    /// First and last moment; both belong to the range.
     const std::pair<DateTimeStruct, DateTimeStruct>& getRange() const { return range_; }
 
     /// Checks and stores the epoch. The object is unchanged when the check raises.

@@ -14,7 +14,9 @@ namespace QLDateTime {
 
 /// An offset. A plain copyable value; the fields hold whatever was stored and carry one sign together.
 struct QL_EXPORT TimeZone {
+    /// Hours ahead of (or, negative, behind) the reference.
     signed char hours = 0;
+    /// Minutes beyond the hours, of the same sign.
     signed char minutes = 0;
 
     TimeZone() = default;

@@ -13,10 +13,12 @@
 
 namespace QLTypeSys {
 
+/// The dimensions of an array, all of them numbers. Callers derive from it.
 class QL_EXPORT NumericDims {
   public:
     virtual ~NumericDims();
 
+    /// Number of dimensions.
     virtual std::size_t getNumDims() const = 0;
 
     /// The dimension at `index`, which is below getNumDims().

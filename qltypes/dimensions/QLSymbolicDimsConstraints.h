@@ -28,6 +28,7 @@ class SymbolicDimsTable;
 /// A fact as an expression, with the blocks that stated it.
 struct SymbolicDimsConstraint {
     int id = 0; ///< symbolic id of the constraint expression
+    /// Blocks that stated it; not owned.
     std::vector<const QLBlock*> blocks;
 };
 
@@ -35,6 +36,7 @@ struct SymbolicDimsConstraint {
 struct SymbolicDimsCGConstraint {
     int first = 0;  ///< symbolic id of the left side
     int second = 0; ///< symbolic id of the right side
+    /// Blocks that stated it; not owned.
     std::vector<const QLBlock*> blocks;
 };
 

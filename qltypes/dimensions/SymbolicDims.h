@@ -31,7 +31,9 @@ class QL_EXPORT SymbolicDims {
   public:
     SymbolicDims(SymbolicDimsTable* table, int id) : table_(table), id_(id) {}
 
+    /// The table; not owned.
     SymbolicDimsTable* getTable() const { return table_; }
+    /// The symbolic id in the table.
     int getId() const { return id_; }
 
     /// Whether it has no operands: a symbol or a number.
@@ -43,6 +45,7 @@ class QL_EXPORT SymbolicDims {
     /// The id of a dimension of a list. For what is no list, its own id whatever the index.
     /// Unchecked: `index` must be below getNumDimensions() of a list.
     int getDimensionId(std::size_t index) const;
+    /// The handle of getDimensionId(index).
     SymbolicDims getDimension(std::size_t index) const;
 
     /// The product of all dimensions, simplified; what has one dimension is its own size, as it is.

@@ -32,6 +32,7 @@ namespace QLTypeSys {
 
 class NumericDims;
 
+/// The symbolic dimensions of one model. Engines derive their own and override the hooks.
 class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
   public:
     /// A symbolic id, and a diagnostic that is null on success.
@@ -53,6 +54,7 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
 
     /// Registers a token, or an expression, for a block. Here nothing is registered: id 0 and no diagnostic.
     virtual DimsRegistration registerSymbolicDims(const char* text, const QLBlock* block);
+    /// Registers an expression for a block. Here nothing is registered: id 0 and no diagnostic.
     virtual DimsRegistration registerSymbolicDimsExpr(const char* text, const QLBlock* block);
 
     /// Is told of a dimension that is lost; does nothing here. An override may make or extend the diagnostic.
@@ -134,6 +136,7 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
     /// True for a valid id. Raises `InvalidDataTypeId` otherwise.
     bool checkSymbolicDimsId(int id) const;
 
+    /// The handle of an id. Unchecked: the id must be valid.
     SymbolicDims getSymbolicDims(int id) const;
     /// The handle of an expression id. Unchecked: it must be below getNumSymbolicDimss().
     SymbolicDims getSymbolicDimsAt(unsigned long exprId) const;
@@ -251,7 +254,9 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
     /// Appends one record for each expression of the operator, oldest first, with its two operands and no blocks.
     /// Unchecked: the operator must have two operands.
     void getOperatorConstraints(QL::SymbolicOp op, std::vector<SymbolicDimsCGConstraint>& list) const;
+    /// getOperatorConstraints() for divisions.
     void getDivisionConstraints(std::vector<SymbolicDimsCGConstraint>& list) const;
+    /// getOperatorConstraints() for modulos.
     void getModuloConstraints(std::vector<SymbolicDimsCGConstraint>& list) const;
 
     // Import.

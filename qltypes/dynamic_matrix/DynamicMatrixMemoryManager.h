@@ -34,6 +34,7 @@ class QL_EXPORT DynamicMatrixMemoryManager {
     DynamicMatrixMemoryManager(const DynamicMatrixMemoryManager&) = delete;
     DynamicMatrixMemoryManager& operator=(const DynamicMatrixMemoryManager&) = delete;
 
+    /// The manager of this process.
     static DynamicMatrixMemoryManager& GetMemoryManager();
 
     /// A new block of `size` bytes and the margin, with no set content. When memory runs out the block is null; such a

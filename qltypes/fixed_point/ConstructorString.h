@@ -23,6 +23,7 @@
 
 /// What a constructor text says.
 struct fxpCtorParseResult {
+    /// The number type.
     fxpDataTypeProp prop;
     bool ScalingGiven; ///< false when the text gave only sign and word length
 };

@@ -39,6 +39,7 @@ enum fxpModeOverflow_tag : int {
 /// What a number type is, independently of any table: mode, sign, width in bits, scaling. A plain copyable value; any
 /// field values can be held, and the checks say whether they make sense.
 struct QL_EXPORT fxpDataTypeProp {
+    /// Fixed point, scaled double, one of the floating types, or boolean.
     fxpModeDataType DataTypeMode;
     unsigned int Signedness;      ///< 1 signed, 0 unsigned, 2 left open
     int WordLength;               ///< total bits

@@ -10,18 +10,29 @@ class QL_EXPORT TORVEXHostInfo {
   public:
     TORVEXHostInfo() = delete;
 
+    /// Bits of char.
     static int getBitsPerChar();
+    /// Bits of short.
     static int getBitsPerShort();
+    /// Bits of int.
     static int getBitsPerInt();
+    /// Bits of long.
     static int getBitsPerLong();
+    /// Bits of long long.
     static int getBitsPerLongLong();
+    /// Bits of a pointer.
     static int getBitsPerPointer();
     /// The width of a pointer.
     static int getWordSize();
+    /// Bits of double.
     static int getBitsPerDouble();
+    /// Bits of float.
     static int getBitsPerFloat();
+    /// Bits of half.
     static int getBitsPerHalf();
+    /// Bits of size_t.
     static int getBitsPerSizeT();
+    /// Bits of ptrdiff_t.
     static int getBitsPerPtrDiffT();
 
     /// 1: long long is available.

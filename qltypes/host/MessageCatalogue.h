@@ -11,7 +11,9 @@ namespace QLTypeSys {
 
 /// One message of the catalogue.
 struct CatalogueRow {
+    /// What the message is about.
     const char* category;
+    /// Which message of the category it is.
     const char* leaf;
     std::string_view argumentKinds; ///< one letter an argument in order: L integer, S narrow text, W wide text
     const char* text;               ///< English, with {0}, {1} ... where the arguments go

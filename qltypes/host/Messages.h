@@ -46,6 +46,7 @@ class Message : public resource_core::BaseMsgID {
 // clang-format off
 namespace QuillaneTypes::general {
 
+// Category QuillaneTypes:general: the identifier is the name, the arguments are those of the text in the catalogue.
 struct InvalidBuiltinDataTypeId : QLTypeSys::failure::Message { explicit InvalidBuiltinDataTypeId(long id) : Message("QuillaneTypes:general", "InvalidBuiltinDataTypeId", id) {} };
 struct CannotSetPropertyOfAliasType : QLTypeSys::failure::Message { CannotSetPropertyOfAliasType(const std::string& property, const std::string& name) : Message("QuillaneTypes:general", "CannotSetPropertyOfAliasType", property, name) {} };
 struct InconsistentDataTypeFcn : QLTypeSys::failure::Message { InconsistentDataTypeFcn(const std::string& property, const std::string& name) : Message("QuillaneTypes:general", "InconsistentDataTypeFcn", property, name) {} };
@@ -59,6 +60,7 @@ struct InvalidNumericTypeIdentifier : QLTypeSys::failure::Message { explicit Inv
 
 namespace QuillaneTypes::Dimensions {
 
+// Category QuillaneTypes:Dimensions: the identifier is the name, the arguments are those of the text in the catalogue.
 struct InconsistentSymbolicDimensionGreaterThan : QLTypeSys::failure::Message { InconsistentSymbolicDimensionGreaterThan(const std::string& dimension, const std::string& bound, const std::string& known) : Message("QuillaneTypes:Dimensions", "InconsistentSymbolicDimensionGreaterThan", dimension, bound, known) {} };
 struct InconsistentSymbolicDimensionLessThan : QLTypeSys::failure::Message { InconsistentSymbolicDimensionLessThan(const std::string& dimension, const std::string& bound, const std::string& known) : Message("QuillaneTypes:Dimensions", "InconsistentSymbolicDimensionLessThan", dimension, bound, known) {} };
 struct InconsistentSymbolicDimensionNotEqual : QLTypeSys::failure::Message { InconsistentSymbolicDimensionNotEqual(const std::string& dimension, const std::string& bound, const std::string& known) : Message("QuillaneTypes:Dimensions", "InconsistentSymbolicDimensionNotEqual", dimension, bound, known) {} };
@@ -67,6 +69,7 @@ struct InconsistentSymbolicDimensionNotEqual : QLTypeSys::failure::Message { Inc
 
 namespace Quillane::DataType {
 
+// Category Quillane:DataType: the identifier is the name, the arguments are those of the text in the catalogue.
 struct DataTypeSizeHasNotBeenSet : QLTypeSys::failure::Message { explicit DataTypeSizeHasNotBeenSet(const std::string& name) : Message("Quillane:DataType", "DataTypeSizeHasNotBeenSet", name) {} };
 struct BlockDataTypeError : QLTypeSys::failure::Message { explicit BlockDataTypeError(const std::string& block) : Message("Quillane:DataType", "BlockDataTypeError", block) {} };
 struct EnumTypeNotAClass : QLTypeSys::failure::Message { EnumTypeNotAClass() : Message("Quillane:DataType", "EnumTypeNotAClass") {} };

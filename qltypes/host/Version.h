@@ -7,9 +7,13 @@
 
 #include "qlplatform/Export.h"
 
+/// The interface breaks when this changes; below 1.0, when the minor version does.
 #define QLTYPES_VERSION_MAJOR 0
+/// Operations were added.
 #define QLTYPES_VERSION_MINOR 1
+/// Nothing but repairs.
 #define QLTYPES_VERSION_PATCH 0
+/// The three numbers as "major.minor.patch".
 #define QLTYPES_VERSION_STRING "0.1.0"
 
 namespace QLTypeSys {

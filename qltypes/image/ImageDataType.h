@@ -40,9 +40,13 @@ class DataTypeTable;
 
 /// The property block of an image type.
 struct ImageProperties {
+    /// Number of channels of a pixel.
     unsigned long numChannels;
+    /// What the channels mean.
     SSImageColorFormat colorFormat;
+    /// How pixels lie in memory.
     SSImageDataLayout dataLayout;
+    /// The type of one channel of one pixel.
     BuiltInDTypeId baseType;
 };
 
@@ -57,9 +61,13 @@ class QL_EXPORT ImageDataType : public DataType {
 
     bool isImage() const override;
 
+    /// Number of channels of a pixel.
     unsigned long getNumChannels() const;
+    /// What the channels mean.
     SSImageColorFormat getColorFormat() const;
+    /// How pixels lie in memory.
     SSImageDataLayout getDataLayout() const;
+    /// The type of one channel of one pixel.
     BuiltInDTypeId getBaseType() const;
 
     // Names and values. The empty text for an unknown value, -1 for an unknown or null name.

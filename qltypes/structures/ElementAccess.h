@@ -47,10 +47,15 @@ class QL_EXPORT StructElementAccess {
     StructElementAccess(const DataTypeTable* table, int id) : table_(table), dataTypeId_(id) {}
     virtual ~StructElementAccess();
 
+    /// Number of elements that the view numbers.
     virtual long getNumElements() const = 0;
+    /// The name of the element. Owned by the element.
     virtual const char* getName(long idx) const = 0;
+    /// The type of the element, aliases not resolved.
     virtual int getDataTypeId(long idx) const = 0;
+    /// The client's id of a unit; -1 for none.
     virtual int getUnitId(long idx) const = 0;
+    /// Number of dimensions; 0 for a plain scalar.
     virtual long getNumDimensions(long idx) const = 0;
     /// Owned by the element; null without dimensions.
     virtual const long* getDimensions(long idx) const = 0;
@@ -60,12 +65,19 @@ class QL_EXPORT StructElementAccess {
     virtual long getComplexWidth(long idx) const;
     /// Bytes from the start of the structure.
     virtual long getOffset(long idx) const = 0;
+    /// Where the run-time dimensions lie, as the client set it.
     virtual long getVarDimsOffset(long idx) const = 0;
+    /// 1 is complex; -1 while not set.
     virtual int getSignalType(long idx) const = 0;
+    /// 1 is frame based; -1 while not set.
     virtual int getSamplingMode(long idx) const = 0;
+    /// 1 is variable dimensions; -1 while not set.
     virtual int getDimensionsMode(long idx) const = 0;
+    /// Design minimum; -inf for none.
     virtual double getMin(long idx) const = 0;
+    /// Design maximum; inf for none.
     virtual double getMax(long idx) const = 0;
+    /// Whether the view answers for `idx`.
     virtual bool isIdxValid(long idx) const = 0;
 
     /// A path as text, such as "y(1).b", behind `prefix`.
@@ -99,9 +111,13 @@ class QL_EXPORT ImmediateElementAccess : public StructElementAccess {
     /// Whether `idx` is from 0 up to but not including the number of elements.
     bool isIdxValid(long idx) const override;
 
+    /// The symbolic dimensions; 0 is numeric.
     int getSymbDimsId(long idx) const;
+    /// The dimensions as 32-bit integers, as StructElement::getDimensionsAsInt.
     const int* getDimensionsAsInt(long idx, const ObsoleteIntDimsKey& key) const;
+    /// Whether the element has a design minimum.
     bool getMinSpec(long idx) const;
+    /// Whether the element has a design maximum.
     bool getMaxSpec(long idx) const;
     /// Whether the element has no dimensions or all of them are 1.
     bool isScalar(long idx) const;
@@ -143,6 +159,7 @@ class QL_EXPORT DFSElementAccess : public StructElementAccess {
     /// Always true.
     bool isIdxValid(long idx) const override;
 
+    /// The symbolic dimensions; 0 is numeric.
     int getSymbDimsId(long idx) const;
     /// The element that stands for a node: the declared one for a leaf and for an array as a whole; one made for the
     /// purpose, with a single dimension of 1, for the root and for an instance of a nested structure. Not to be
@@ -196,10 +213,13 @@ class QL_EXPORT FlatElementAccess : public StructElementAccess {
 
     /// The depth-first index of a leaf.
     long getDFSIdx(long flatIdx) const;
+    /// The symbolic dimensions; 0 is numeric.
     int getSymbDimsId(long idx) const;
     /// As in the depth-first view.
     void getImmediateParentDTypeIdAndOffset(long idx, int& parentId, long& elementIdx) const;
+    /// Appends the way to a leaf, as in the depth-first view.
     void getFullPath(long idx, bool fromRoot, Path& path) const;
+    /// The way to a leaf as UTF-16 text.
     std::u16string getFullPathAsString(long idx, bool fromRoot) const;
 
   private:
@@ -212,14 +232,18 @@ class QL_EXPORT RawElementAccess {
     /// Keeps `table`, which must outlive the view. Unchecked: `id` must be a structure or an alias of one.
     RawElementAccess(const DataTypeTable* table, int id) : table_(table), dataTypeId_(id) {}
 
+    /// Number of scalar values; a complex one counts twice.
     long getNumElements() const;
     /// Whether `idx` is from 0 up to but not including the number of values.
     bool isIdxValid(long idx) const;
     /// Goes on from the immediate element `immediateIdx`, whose first value is `rawBase`, to the one that holds
     /// `rawIdx`, and leaves its index, type and first value in the three. Start with 0 and 0.
     void computeDataTypeIdAndIndex(long rawIdx, long& immediateIdx, int& dataTypeId, long& rawBase) const;
+    /// The type of the element that holds the value, aliases not resolved.
     int getDataTypeId(long rawIdx) const;
+    /// The client's id of that element's unit; -1 for none.
     int getUnitId(long rawIdx) const;
+    /// That element's symbolic dimensions; 0 is numeric.
     int getSymbDimsId(long rawIdx) const;
     /// Bytes from the start of the structure; the imaginary part of a complex value lies behind its real part.
     long getOffset(long rawIdx) const;

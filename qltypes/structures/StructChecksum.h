@@ -27,11 +27,14 @@ class QL_EXPORT StructElemTypeDesc {
 
 /// One element as it enters a checksum.
 struct QL_EXPORT StructElemDesc {
+    /// The name of the element.
     std::string name;
     const StructElemTypeDesc* type = nullptr;                        ///< not owned
     const QLTypeSys::SymbolicDimsTable* symbolicDimsTable = nullptr; ///< where `symbDimsId` is resolved; may be null
+    /// The symbolic dimensions; 0 is numeric.
     int symbDimsId = 0;
     std::vector<unsigned long> dims; ///< used where `symbDimsId` is no symbolic dimension
+    /// Whether the element is complex.
     bool isComplex = false;
 
     /// The text that enters the checksum, such as "double:pos:[ 3 ];" or "single:iq:[ 1 ]:complex;". Dimensions that

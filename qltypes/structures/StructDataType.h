@@ -31,6 +31,7 @@ struct ElementIndexes;
 
 /// What a depth-first view answered for one index.
 struct QL_EXPORT CachedElement {
+    /// The element; null while not asked for.
     StructElement* element = nullptr;
     bool ownsElement = false; ///< the entry made the element and deletes it
     long offset = -1;         ///< -1 while not asked for
@@ -44,14 +45,21 @@ struct QL_EXPORT CachedElement {
 
 /// What is asked of a structure again and again, derived from its elements and the structures nested in it.
 struct FrequentlyAccessedProperties {
+    /// An element, of nested structures too, is frame based.
     bool hasFrameBasedElements;
+    /// An element, of nested structures too, has variable dimensions.
     bool hasVarDims;
     bool hasAOB; ///< an array of structures, or a nested structure of variable dimensions
+    /// An element, of nested structures too, is complex.
     bool hasComplexData;
+    /// An element, of nested structures too, is a string.
     bool hasStringData;
     bool hasConstructFcn; ///< always false, as the next two: see getPlainConstruct() and its like of the record
+    /// Always false.
     bool hasDestructFcn;
+    /// Always false.
     bool hasDeepCopyFcn;
+    /// An element, of nested structures too, is half.
     bool hasHalfPrecisionData;
 };
 
@@ -61,6 +69,7 @@ class QL_EXPORT StructDataType : public QLTypeSys::DataType {
     StructDataType(int id, const std::string& name, DataTypeSource source);
     ~StructDataType() override;
 
+    /// Immediate elements.
     virtual long getNumElements() const;
     /// Makes `count` default elements. Called once, on an empty record: a second call abandons the elements that were
     /// there, which are then the caller's to delete.
@@ -157,5 +166,6 @@ class QL_EXPORT BusDataType : public StructDataType {
     double sameMinValForAllLeaf = -std::numeric_limits<double>::infinity();
     /// The maximum that all leaves share; +inf when no leaf has one, -inf when they differ.
     double sameMaxValForAllLeaf = std::numeric_limits<double>::infinity();
+    /// Whether a leaf has symbolic dimensions.
     bool hasLeafWithSymbolicDimensions = false;
 };

@@ -22,6 +22,7 @@ struct ObsoleteIntDimsKey {};
 /// Who writes type, dimensions or signal type without the setters after views were asked calls
 /// StructDataType::clearDFSCache on the structure and on those that contain it.
 struct QL_EXPORT StructElement {
+    /// The name.
     std::string name;
     int dataTypeId = -10; ///< -10 while not set
     int unitId = -1;      ///< id of a unit, the client's
@@ -51,6 +52,7 @@ struct QL_EXPORT StructElement {
 
     /// Null stores the empty name.
     void setName(const char* elementName);
+    // Setters. Each writes the field of its name; type and signal type also tell the views.
     void setDataTypeId(int id);
     void setUnitId(int id) { unitId = id; }
     void setSymbDimsId(int id) { symbDimsId = id; }

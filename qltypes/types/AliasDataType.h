@@ -23,8 +23,11 @@ class QL_EXPORT AliasDataType : public DataType {
     int getIdAliasedTo() const override;
     int getIdAliasedThruTo() const override;
     std::vector<int> dependsOn() const override;
+    /// True: what is an alias already does not become one.
     bool getIsAliasToLocked() const override;
+    /// The record that the definition names has become `type`.
     void updateAliasedToType(DataType* type) override;
+    /// The record at the end of the chain has become `type`.
     void updateAliasedThruToType(DataType* type) override;
 
     // Forwarded to the record at the end of the chain.
@@ -146,7 +149,9 @@ class QL_EXPORT AliasDataType : public DataType {
     void setTargetSize(int size) override;
     void setDefaultGround(bool isDefault) override;
     void setConstructedGround(bool isConstructed) override;
+    /// Does nothing: the alias answers by its target.
     virtual void setIdAliasedTo(int id);
+    /// Does nothing: the alias answers by its target.
     virtual void setIdAliasedThruTo(int id);
 
   protected:

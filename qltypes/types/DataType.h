@@ -131,13 +131,16 @@ class QL_EXPORT DataType {
     virtual void setIsPositiveFcn(IsPositiveFcn f);
 
     // Further properties.
+    /// Whether values are pointers.
     virtual void setIsPointerType(bool isPointer);
     virtual bool getIsPointerType() const;
     /// The id that this alias names in its definition; -10 for a record that is no alias.
     virtual int getIdAliasedTo() const;
     /// The id at the end of the alias chain; the own id for a record that is no alias.
     virtual int getIdAliasedThruTo() const;
+    /// Converts values from the layout of the host to that of the target; null while not set.
     virtual HostToTargetFcn getHostToTargetFcn() const;
+    /// Converts values from the layout of the target to that of the host; null while not set.
     virtual TargetToHostFcn getTargetToHostFcn() const;
     /// Bytes of one value on the target.
     virtual int getTargetSize() const;
@@ -168,6 +171,7 @@ class QL_EXPORT DataType {
     /// Copies the property block, once. Raises `CannotSetPropertiesBeforeSettingSize`,
     /// `CannotModifyDataTypeProperties`, and out of memory.
     virtual void setProperties(const void* properties);
+    /// Bytes of the property block; 0 for none.
     virtual int getPropertiesSize() const;
     /// Sets the bytes of the property block, once. Raises `CannotModifyDataTypePropertiesSize` and
     /// `InvalidDataTypePropertiesSize`.
@@ -201,6 +205,7 @@ class QL_EXPORT DataType {
     virtual bool canContainNegativeNumbers() const;
 
     // Data of clients.
+    /// The code generator's type, or null; not owned.
     virtual CG::Type* getCGType() const;
     virtual void setCGType(CG::Type* type);
     /// The four words of the checksum of the type.
@@ -213,8 +218,11 @@ class QL_EXPORT DataType {
     virtual void setInterface(txArray_tag* array);
 
     // Kind, printing, flags.
+    /// Whether the record itself is of that kind; an alias answers for itself.
     virtual bool getIsType(DataTypeQualifier qualifier) const;
+    /// The kind of the record itself.
     virtual DataTypeQualifier getType() const;
+    /// Changes the kind of the record itself.
     virtual void setType(DataTypeQualifier qualifier);
     /// Writes name, id, size, storage id and qualifier, a line each, then a blank line.
     virtual void print(std::ostream& os) const;
@@ -239,11 +247,15 @@ class QL_EXPORT DataType {
     virtual void destroyScalarElement(void* p) const;
 
     // Upkeep by the table.
+    /// A mark for walks over the types.
     virtual bool getVisitFlag() const;
     virtual void setVisitFlag(bool visited) const;
+    /// Whether the record may no longer become an alias.
     virtual bool getIsAliasToLocked() const;
     virtual void setIsAliasToLocked(bool locked);
+    /// Tells an alias that the record which its definition names has become `type`; nothing happens here.
     virtual void updateAliasedToType(DataType* type);
+    /// Tells an alias that the record at the end of its chain has become `type`; nothing happens here.
     virtual void updateAliasedThruToType(DataType* type);
 
     // Not virtual: the record's own fields, also on an alias.
@@ -261,7 +273,9 @@ class QL_EXPORT DataType {
 
     unsigned long sizeOf() const { return getSizeOfFcn()(); }
     void* containedData(void* value) const { return getContainedDataFcn()(value); }
+    /// Id of the data held inside a value, or -10.
     int containedDataType() const { return containedDataType_; }
+    /// Number of dimensions of the data held inside a value.
     unsigned long containedDataNumDims() const { return containedDataNumDims_; }
     void containedDataDims(const void* value, unsigned long* dims) const { getContainedDataDimsFcn()(value, dims); }
     /// Builds `dst` from initial data. Raises `DataTypeFcnUnknownError` when the function reports a failure.

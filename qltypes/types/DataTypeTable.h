@@ -104,7 +104,7 @@ class QL_EXPORT DataTypeTable {
     /// Whether registering an existing name answers its id (true here) instead of replacing its record.
     virtual bool shortCircuitRegistration(DataTypeSource source) const;
 
-    // Diagnostics settings; what the numbers mean is the subclass's.
+    // Settings: what the numbers mean is the subclass's business; here they are constants.
     virtual int getParameterUnderflowDiagnostic() const;
     virtual int getParameterOverflowDiagnostic() const;
     virtual int getParameterPrecisionLossDiagnostic() const;
@@ -115,11 +115,13 @@ class QL_EXPORT DataTypeTable {
     virtual int getDataSaturationDiagnostic() const;
     virtual bool getUseIntDivNetSlopeOpt() const;
 
+    /// Prints the number of types and every record.
     virtual void print(std::ostream& os) const;
     /// The property block at the end of the alias chain; `caller` is not used. Raises `InvalidDataTypeId`.
     virtual const void* getDataTypeProperties(const char* caller, int id) const;
 
-    // Hooks for what only a subclass knows: enumeration objects, the override machinery, code generation.
+    // Hooks for what only a subclass knows: enumeration objects, the override machinery, code generation. Here they
+    // answer null or false and store nothing.
     virtual txArrayPtr getOrdinalValuesFromEnumObject(const txArray_tag* object) const;
     virtual bool isOverriddenObjectName(const std::string& name) const;
     virtual const char* getEnumTypeStringFromValue(int id, int value) const;
@@ -144,7 +146,9 @@ class QL_EXPORT DataTypeTable {
     DataType* getDataTypeAt(unsigned long index) const { return dataTypes_[index]; }
     /// Number of records, auto included.
     int getNumDataTypes() const { return static_cast<int>(dataTypes_.size()); }
+    /// Whether the id has a record here: -1 up to but not including the first free id.
     bool isDataTypeIdValid(int id) const;
+    /// The same, and not -1.
     bool isDataTypeIdValid_NotAuto(int id) const;
     /// True for a valid id. Raises `InvalidDataTypeId` for any other.
     bool checkDataTypeId(int id) const;
@@ -158,6 +162,7 @@ class QL_EXPORT DataTypeTable {
     /// The id of a built-in name, else -10; null is no name.
     static int getBuiltInDataType(const char* name);
     static int getBuiltInDataType(const std::u16string& name);
+    /// Whether the name is that of a built-in type; false for null.
     static bool nameOfBuiltInDataType(const char* name);
     static bool nameOfBuiltInDataType(const std::u16string& name);
     /// True for "logical", "half", "int64" and "uint64", which are treated as built-in by name.
@@ -169,19 +174,28 @@ class QL_EXPORT DataTypeTable {
     static int getBuiltInDataTypeSize(int id);
     /// The number record of ids 0 to 8. Raises `InvalidBuiltinDataTypeId`.
     static const fxpDataTypeProp& getBuiltinDataTypeProperties(int id);
+    /// Number of built-in types, 9.
     static int getNumBuiltInDataTypes();
+    /// Whether the id is 9 to 13.
     static bool isPredefinedDataType(int id);
     /// Whether the name is an identifier; false for null.
     static bool isAValidDataType(const char* name);
 
+    /// Whether the type at the end of the alias chain is a string; false for an invalid id.
     bool IsStringDataType(int id) const;
+    /// Whether the type at the end of the alias chain is an enumeration; false for -10 and -1. Raises
+    /// `InvalidDataTypeId` for any other invalid id.
     bool isEnumType(int id) const;
     /// True for auto too. Raises `InvalidDataTypeId` for -10.
     bool IsDataTypeNumericNonBoolean(int id) const;
     /// True for auto too. Raises `InvalidDataTypeId` for -10.
     bool IsDataTypeNumericOrBoolean(int id) const;
+    /// Whether the type at the end of the alias chain is of fixed point and not a scaled double. Raises
+    /// `InvalidDataTypeId`.
     bool IsFixptDTNotScaledDouble(int id) const;
+    /// Whether the type at the end of the alias chain is an integer of 64 bits. Raises `InvalidDataTypeId`.
     bool Is64BitType(int id) const;
+    /// Whether values of the type are stored as a dynamic matrix; false for an invalid id.
     bool IsImplementedAsDynamicMatrixDataType(int id) const;
     /// The type under which values are logged: built-ins as they are, enumerations by storage, all else as double.
     int getDataTypeLoggingId(int id) const;
@@ -230,11 +244,13 @@ class QL_EXPORT DataTypeTable {
     /// The type as host-language text, such as "Bus: Engine" or "fixdt('sfix16_En7')".
     std::string getDTACompliantString(int id) const;
 
+    /// Whether the name has a function that registers its type.
     bool hasCustomDataTypeCallback(const char* name) const;
     /// Enters a function under a name; the first one stays.
     void insertCustomDataTypeCallback(const char* name, CustomDataTypeCallback callback);
     /// Calls the function. Unchecked: the name must have one.
     int executeCustomDataTypeCallback(const char* name);
+    /// The names that have such a function, in no order.
     std::vector<std::string> getAllCustomDataTypeName() const;
     /// Enters the header file of a custom type; the first one stays, also over resetToBuiltin.
     void insertCustomDataTypeHeaderFilePair(const std::string& type, const std::string& header);
@@ -245,20 +261,31 @@ class QL_EXPORT DataTypeTable {
 
     // One index, one virtual call and the function, inline so that no more comes between.
 
+    /// Builds a value in the memory at `p`.
     void construct(int id, void* p) const { recordAt(id)->constructScalarElement(p); }
+    /// Takes the value at `p` apart; its memory stays.
     void destruct(int id, void* p) const { recordAt(id)->destroyScalarElement(p); }
+    /// Copies a value; both must be constructed.
     void deepCopy(int id, void* dst, const void* src) const { recordAt(id)->deepCopyScalarElement(src, dst); }
+    /// Writes the value as bytes. `a` and `b` are passed through to the function of the type.
     void serialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const {
         recordAt(id)->serializeScalarElement(src, dst, a, b);
     }
+    /// Reads a value from bytes. `a` and `b` are passed through to the function of the type.
     void deserialize(int id, void* dst, const void* src, unsigned long a, unsigned long b) const {
         recordAt(id)->deserializeScalarElement(src, dst, a, b);
     }
+    /// Bytes that serialize() writes.
     unsigned long serializeSize(int id, const void* p) const { return recordAt(id)->serializeSizeScalarElement(p); }
+    /// Bytes of a value. Unchecked: the type must have the function.
     unsigned long sizeOf(int id) const { return recordAt(id)->sizeOf(); }
+    /// The data inside the value. Unchecked: the type must have the function.
     void* containedData(int id, void* p) const { return recordAt(id)->containedData(p); }
+    /// The type of the data inside a value, or -10.
     int containedDataType(int id) const { return recordAt(id)->containedDataType(); }
+    /// Number of dimensions of the data inside a value.
     unsigned long containedDataNumDims(int id) const { return recordAt(id)->containedDataNumDims(); }
+    /// Stores the dimensions of the data inside the value. Unchecked: the type must have the function.
     void containedDataDims(int id, const void* p, unsigned long* dims) const {
         recordAt(id)->containedDataDims(p, dims);
     }
@@ -320,6 +347,7 @@ class QL_EXPORT DataTypeTable {
     _qlDataTypeAccess_tag* getDataTypeAccess() const { return dataTypeAccess_; }
     /// Takes over a block from utCalloc. The one before is the caller's.
     void setDataTypeAccess(_qlDataTypeAccess_tag* access) { dataTypeAccess_ = access; }
+    /// Diagnostics that a client gathers; not owned.
     qlsvDiagnosticImpl* getDtaErrorQueue() const { return dtaErrorQueue_; }
     void setDtaErrorQueue(qlsvDiagnosticImpl* queue) { dtaErrorQueue_ = queue; }
 

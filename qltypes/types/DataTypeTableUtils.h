@@ -148,7 +148,8 @@ QL_EXPORT qlsvDiagnosticImpl* DtSetDeepCopyFcn(QLTypeSys::DataTypeTable* table, 
 QL_EXPORT qlsvDiagnosticImpl* DtSetDeepCopyFcnName(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const char* name);
 QL_EXPORT qlsvDiagnosticImpl* DtSetDataTypeProperties(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const void* properties);
 
-// --- Forwards to the member of the table, and accessors of its fields.
+// --- Forwards: the member of QLTypeSys::DataTypeTable that has the name, or the field that it reads or writes.
+//     Checks and failures are those of the member.
 
 QL_EXPORT int DtGetDataTypeId(const QLTypeSys::DataTypeTable* table, const char* name);
 QL_EXPORT qlsvDiagnosticImpl* DtRegisterDataType(QLTypeSys::DataTypeTable* table, const char* blockName, const char* name, DataTypeSource source, int* id);

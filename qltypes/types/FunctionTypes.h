@@ -15,10 +15,13 @@ class DataTypeTable;
 /// The block that a table passes first to conversion and comparison functions. Its first word is the table; the other
 /// words are entries that a client fills, of which the library calls the eighth (see DtTableHasInvalidDataTypeSize).
 struct _qlDataTypeAccess_tag {
+    /// The table.
     QLTypeSys::DataTypeTable* table;
+    /// The client's.
     void* clientEntriesBefore[6];
     /// Properties of a type: the table, a caller text, the identifier, a number whose meaning is the client's.
     const fxpDataTypeProp* (*getFxpDataTypeProp)(QLTypeSys::DataTypeTable*, const char*, int, int);
+    /// The client's.
     void* clientEntriesBehind[24];
 };
 

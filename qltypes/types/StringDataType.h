@@ -40,6 +40,7 @@ class QL_EXPORT StringDataType : public DataType {
     /// Drops the text and nulls the slot.
     void destroyScalarElement(void* slot) const override;
 
+    /// Whether texts may be of any length.
     bool isDynamic() const { return maxStringLength_ == 0; }
     /// In UTF-16 units; 0 for a dynamic string.
     unsigned long getMaxStringLength() const { return maxStringLength_; }

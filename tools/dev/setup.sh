@@ -19,7 +19,7 @@ isThere() {
     case $1 in
     g++) has c++ ;;
     ninja-build) has ninja ;;
-    cmake | git | python3 | pkg-config | file | chromium | gdb) has "$1" ;;
+    cmake | git | python3 | pkg-config | file | chromium | gdb | doxygen) has "$1" ;;
     chromium-driver) has chromedriver ;;
     clang) has clang++ ;;
     dpkg-dev) has dpkg-shlibdeps ;;
