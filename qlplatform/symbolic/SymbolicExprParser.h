@@ -29,6 +29,7 @@ class qlsvDiagnosticImpl;
 
 namespace QL {
 
+/// Reads texts of expressions into a table.
 class QL_EXPORT SymbolicExprParser {
   public:
     /// The expression id, and a diagnostic that is null on success.

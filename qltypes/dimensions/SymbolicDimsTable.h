@@ -234,7 +234,7 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
     bool hasGreaterThanConstraint(int a, int value);
     bool hasLessThanConstraint(int a, int value);
 
-    // Blocks of the listings are taken as they are.
+    // Listings: as those of SymbolicDimsConstraints with the same name; blocks are taken as they are.
     void getSymbolicDimsConstraints(std::vector<SymbolicDimsConstraint>& list) const;
     void getSymbolicDimsConstraints(std::vector<int>& ids) const;
     void getSymbolicDimsConstraints(const QLBlock* block, std::vector<int>& ids) const;
