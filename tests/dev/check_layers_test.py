@@ -77,6 +77,16 @@ class CheckLayers(unittest.TestCase):
         self.write("qltypes/novel/Thing.h", "")
         self.assertComplaint("qltypes/novel/Thing.h:1: no group")
 
+    def test_picture_that_is_not_that_of_the_list(self):
+        marks = ["<!-- layers: written by tools/dev/check_layers --update -->", "<!-- end of layers -->"]
+        self.write("docs/dev/architecture.md", "# Head", *marks, "Tail")
+        self.assertComplaint("docs/dev/architecture.md:")
+        subprocess.run([sys.executable, TOOLS / "check_layers", "--update", self.root], check=True, capture_output=True)
+        self.assertEqual(self.check()[0], 0)
+        lines = (self.root / "docs/dev/architecture.md").read_text().splitlines()
+        self.assertEqual((lines[0], lines[-1]), ("# Head", "Tail"))
+        self.assertIn("    image --> dynamic_matrix", lines)
+
     def test_allowance(self):
         self.write("qltypes/types/DataTypeTable.cpp", '#include "qltypes/structures/StructDataType.h"')
         self.allow("allow qltypes/types/DataTypeTable.cpp -> qltypes/structures/StructDataType.h : makes the records")

@@ -11,7 +11,7 @@ import sys
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 blocks = re.findall(r"^```\w*\n(.*?)^```$", (ROOT / "README.md").read_text(), re.MULTILINE | re.DOTALL)
 
-for file in ("examples/01_first_structure.cpp", "examples/expected/01_first_structure.txt"):
+for file in ("examples/04_first_structure.cpp", "examples/expected/04_first_structure.txt"):
     assert (ROOT / file).read_text() in blocks, f"README.md does not show {file} as it is"
 if len(sys.argv) > 1:
     layout = subprocess.run([sys.argv[1], "layout", ROOT / "examples/outer.json"], check=True, capture_output=True, text=True)
