@@ -51,9 +51,11 @@ class QL_EXPORT QLSymbolicExprErrorChecker {
                                       _T_parse_tree_T<char>* node, const char* text, const SymbolicExprTable& table);
     /// Also an imaginary literal, which is its own name.
     virtual void reportComplexValue(const std::string& name, const char* text, unsigned long position);
+    /// A division, where there must be none.
     virtual void reportDivisionExpr(_T_parse_tree_T<char>* node, const char* text);
     /// A value that is no number: a cell, a structure, a text, an object; or one that no double holds exactly.
     virtual void reportUnsupportedValue(const std::string& name, const char* text, unsigned long position);
+    /// A number that is not whole, where it must be.
     virtual void reportNonIntegerValue(const std::string& name, const char* text, unsigned long position);
     /// A literal that is no whole number: 0.5, Inf, a text.
     virtual void reportInvalidLiteralValue(const std::string& name, const char* text, unsigned long position);

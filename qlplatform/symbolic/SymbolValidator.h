@@ -29,9 +29,11 @@ class SymbolRegistry;
 ///   null   empty  nothing: the text around it is not symbolic
 struct SymbolRecord {
     std::shared_ptr<const txArray_tag> value; ///< shared with whoever else keeps the array
+    /// The name of the symbol; empty for none.
     std::string name;
 };
 
+/// Says what the identifiers of a text stand for. Engines derive their own.
 class QL_EXPORT SymbolValidator {
   public:
     virtual ~SymbolValidator();

@@ -36,8 +36,10 @@
 
 namespace QL {
 
+/// Reads texts of the host language into an expression table: walks the tree of a text and makes its expressions.
 class QL_EXPORT SymbolicExprFromTParseTree {
   public:
+    /// A node of the tree of a text.
     using Node = _T_parse_tree_T<char>;
 
     /// An expression id or SymbolicExprTable::noExpr, and the diagnostic of all complaints, null when there are none;
@@ -105,9 +107,12 @@ class QL_EXPORT SymbolicExprFromTParseTree {
     void reportInvalidExpr(const char* text, qlsvDiagnosticImpl* refusal);
 
   protected:
+    /// Deletes the tree that a Tree owns.
     struct TreeDeleter {
+        /// Deletes the tree; null is allowed.
         void operator()(Node* tree) const { delete_parse_tree(tree); }
     };
+    /// Owns the tree of a text.
     using Tree = std::unique_ptr<Node, TreeDeleter>;
 
     /// Keeps the address of the table.
@@ -116,6 +121,7 @@ class QL_EXPORT SymbolicExprFromTParseTree {
     /// To be called once, before anything is read. Keeps the address, which is no longer used when this is destroyed.
     void setErrorChecker(QLSymbolicExprErrorChecker& checker) { checker_ = &checker; }
 
+    /// The table that expressions are made in.
     SymbolicExprTable& getTable() const { return table_; }
 
     /// The tree of a text, or null with a report.

@@ -16,6 +16,7 @@
 
 namespace QLTypeSys {
 
+/// The expressions of the parameters of one model, with the data types of their symbols. Engines derive their own.
 class QL_EXPORT ParamSymbolicExprTable : public QL::SymbolRegistry {
   public:
     ParamSymbolicExprTable();

@@ -17,6 +17,7 @@
 
 namespace QL {
 
+/// Reads texts of dimensions into an expression table.
 class QL_EXPORT SymbolicDimsFromTParseTree : public SymbolicExprFromTParseTree {
   public:
     /// Keeps both addresses.
@@ -41,6 +42,7 @@ class QL_EXPORT SymbolicDimsFromTParseTree : public SymbolicExprFromTParseTree {
     /// the dimensions that it has beyond the numeric ones are told to the validator and left out.
     Registration operator()(const char* text, const QLTypeSys::NumericDims& dims);
 
+    /// Where complaints are gathered.
     QLTypeSys::QLSymbolicDimsErrorChecker& getErrorChecker() { return checker_; }
 
   private:

@@ -101,8 +101,11 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
 
     /// An expression of some table. The diagnostic belongs to the caller and may be there when it is `ok`.
     struct CheckedExpr {
+        /// The id in that table.
         unsigned long exprId;
+        /// What went wrong, or null.
         qlsvDiagnosticImpl* diagnostic;
+        /// Whether there is an expression.
         bool ok;
     };
     /// Reads dimensions into `exprTable`, simplifies them and leaves out those of 1 at the end, of which two are kept.
@@ -115,8 +118,11 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
 
     /// A text. The diagnostic belongs to the caller and may be there when it is `ok`.
     struct CheckedText {
+        /// The text.
         std::u16string text;
+        /// What went wrong, or null.
         qlsvDiagnosticImpl* diagnostic;
+        /// Whether there is a text.
         bool ok;
     };
     /// Checks dimensions as generateExprIdFromExpr, in a table of its own, and gives their text in the host language.
