@@ -42,7 +42,7 @@ std::string converted(double value, int id, fxpModeOverflow_tag overflow, fxpMod
 std::string row(const std::string& head, const auto& values, auto&& cell) {
     std::string text = "| " + head + " |";
     for (const double value : values)
-        text += " " + cell(value) + " |";
+        text += " " + std::string(cell(value)) + " |";
     return text + "\n";
 }
 
