@@ -18,7 +18,7 @@ LIBRARY = re.escape(library_folder)
 # Which package has a file whose path below /usr matches; the first pattern that matches counts.
 HOME = ((rf"{LIBRARY}/lib\w+\.so\.", RUNTIME), (rf"{LIBRARY}/lib\w+\.so$", DEVELOPMENT), (r"include/", DEVELOPMENT),
         (rf"{LIBRARY}/(cmake|pkgconfig)/", DEVELOPMENT), (r"share/(qltypes/)?gdb/", DEVELOPMENT),
-        (r"bin/|share/qltypes/", TOOLS))
+        (r"bin/|share/qltypes/|share/man/", TOOLS))
 
 
 def run(*command):
