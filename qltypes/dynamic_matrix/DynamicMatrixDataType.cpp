@@ -23,6 +23,14 @@ const char* DynamicMatrixDataType::getName() const {
 
 bool DynamicMatrixDataType::isDynamicMatrix() const { return true; }
 
+void DynamicMatrixDataType::constructScalarElement(void* p) const {
+    DataType::constructScalarElement(p);
+    if (plainConstruct_) return;
+    auto& matrix = *static_cast<DynamicMatrix*>(p);
+    matrix.setDims(std::vector<long>(containedDataNumDims_));
+    matrix.elementSize = static_cast<unsigned long>(elementSize_);
+}
+
 std::string DynamicMatrixDataType::ComputeName(const DataTypeTable* table, int elementId, unsigned long numDims) {
     const char* elementName = DtGetDataTypeName(table, elementId);
     if (!elementName) throw std::logic_error("basic_string::_M_construct null not valid");

@@ -24,6 +24,8 @@ class QL_EXPORT DynamicMatrixDataType : public DataType {
     /// rank.
     const char* getName() const override;
     bool isDynamicMatrix() const override;
+    /// The new value has as many dimensions as the type, all 0, and knows the size of its elements.
+    void constructScalarElement(void* p) const override;
 
     /// Bytes of one element.
     long getElementSize() const { return elementSize_; }

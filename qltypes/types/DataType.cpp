@@ -7,8 +7,6 @@
 
 #include "qlplatform/arrays/HostArray.h"
 #include "qlplatform/memory/Memory.h"
-#include "qltypes/dynamic_matrix/DynamicMatrix.h"
-#include "qltypes/dynamic_matrix/DynamicMatrixDataType.h"
 #include "qltypes/fixed_point/TypeNames.h"
 #include "qltypes/host/Assert_internal.h"
 #include "qltypes/host/Failure_internal.h"
@@ -358,35 +356,61 @@ void DataType::reportFailedFcn(const char* operation) const {
     failure::raise(QuillaneTypes::general::DataTypeFcnUnknownError(operation, getName()));
 }
 
+// The operations by identifier are to cost one virtual call and the function. So a record's own function is asked for
+// through its getter only where none was set, and that road is kept out of the short one.
+
+[[gnu::noinline, gnu::cold]] void DataType::deepCopyThroughGetter(const void* src, void* dst) const {
+    if (!getDeepCopyFcn()(dst, src)) reportFailedFcn("DeepCopy");
+}
+
+[[gnu::noinline, gnu::cold]] void DataType::destroyThroughGetter(void* p) const {
+    if (!getDestructFcn()(p)) reportFailedFcn("Destruct");
+}
+
+[[gnu::noinline, gnu::cold]] void DataType::constructThroughGetter(void* p) const {
+    if (!getConstructFcn()(p, getProperties())) reportFailedFcn("Construct");
+}
+
 void DataType::deepCopyScalarElement(const void* src, void* dst) const {
-    if (plainCopy_)
+    if (plainCopy_) {
         std::memcpy(dst, src, static_cast<std::size_t>(size_));
-    else if (!getDeepCopyFcn()(dst, src))
+        return;
+    }
+    if (!deepCopyFcn_) [[unlikely]]
+        return deepCopyThroughGetter(src, dst);
+    if (!deepCopyFcn_(dst, src)) [[unlikely]]
         reportFailedFcn("DeepCopy");
 }
 
 void DataType::destroyScalarElement(void* p) const {
-    if (!plainDestroy_ && !getDestructFcn()(p)) reportFailedFcn("Destruct");
+    if (plainDestroy_) return;
+    if (!destructFcn_) [[unlikely]]
+        return destroyThroughGetter(p);
+    if (!destructFcn_(p)) [[unlikely]]
+        reportFailedFcn("Destruct");
 }
 
 void DataType::constructScalarElement(void* p) const {
     if (plainConstruct_) return;
-    if (!getConstructFcn()(p, getProperties())) reportFailedFcn("Construct");
-    if (!isDynamicMatrix()) return;
-    auto& matrix = *static_cast<DynamicMatrix*>(p);
-    matrix.setDims(std::vector<long>(containedDataNumDims_));
-    matrix.elementSize = static_cast<unsigned long>(static_cast<const DynamicMatrixDataType*>(this)->getElementSize());
+    if (!constructFcn_) [[unlikely]]
+        return constructThroughGetter(p);
+    if (!constructFcn_(p, getProperties())) [[unlikely]]
+        reportFailedFcn("Construct");
 }
 
 void DataType::serializeScalarElement(const void* src, void* dst, unsigned long a, unsigned long b) const {
-    if (!getSerializeFcn()(dst, src, a, b)) reportFailedFcn("Serialize");
+    if (!(serializeFcn_ ? serializeFcn_ : getSerializeFcn())(dst, src, a, b)) [[unlikely]]
+        reportFailedFcn("Serialize");
 }
 
 void DataType::deserializeScalarElement(const void* src, void* dst, unsigned long a, unsigned long b) const {
-    if (!getDeserializeFcn()(dst, src, a, b)) reportFailedFcn("Deserialize");
+    if (!(deserializeFcn_ ? deserializeFcn_ : getDeserializeFcn())(dst, src, a, b)) [[unlikely]]
+        reportFailedFcn("Deserialize");
 }
 
-unsigned long DataType::serializeSizeScalarElement(const void* src) const { return getSerializeSizeFcn()(src); }
+unsigned long DataType::serializeSizeScalarElement(const void* src) const {
+    return (serializeSizeFcn_ ? serializeSizeFcn_ : getSerializeSizeFcn())(src);
+}
 
 void DataType::dataConstruct(unsigned long numDims, const unsigned long* dims, unsigned long elementSize,
                              const void* data, void* dst) const {

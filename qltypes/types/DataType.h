@@ -368,6 +368,9 @@ class QL_EXPORT DataType {
     template <class F> void defineCustom(const char* property, F& field, F value, bool& plainFlag);
     template <class F> void defineOnce(const char* property, F& field, F value);
     template <class F> void defineOnceForTarget(F& field, F value);
+    void deepCopyThroughGetter(const void* src, void* dst) const;
+    void destroyThroughGetter(void* p) const;
+    void constructThroughGetter(void* p) const;
     [[noreturn]] void reportFailedFcn(const char* operation) const;
 };
 

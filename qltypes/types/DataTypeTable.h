@@ -312,11 +312,31 @@ class QL_EXPORT DataTypeTable {
     void convertToUsingDstId(int dstId, int srcId, int count, const void* src, const void* aux, void* dst) const;
     /// 1 above zero, 0 for zero, -1 for all else, NaN included.
     void sign(int id, const void* src, const void* aux, signed char* result) const;
-    void isPositive(int id, int count, const void* data, const void* aux, void* result) const;
+    void isPositive(int id, int count, const void* data, const void* aux, void* result) const {
+        int resolvedId = id;
+        const IsPositiveFcn f =
+            functionAt(resolvedId, &DataType::isPositiveFcn_, &DataType::getIsPositiveFcn, "IsPositiveFcn");
+        succeeded(f(dataTypeAccess_, nullptr, resolvedId, count, data, aux, result), "IsPositive", id);
+    }
     void isPositive(int id, const void* data, const void* aux, signed char* result) const;
-    void isNegative(int id, int count, const void* data, const void* aux, void* result) const;
-    int greaterThan(int id, int count, const void* left, const void* right, const void* aux, void* result) const;
-    int greaterEqual(int id, int count, const void* left, const void* right, const void* aux, void* result) const;
+    void isNegative(int id, int count, const void* data, const void* aux, void* result) const {
+        int resolvedId = id;
+        const IsNegativeFcn f =
+            functionAt(resolvedId, &DataType::isNegativeFcn_, &DataType::getIsNegativeFcn, "IsNegativeFcn");
+        succeeded(f(dataTypeAccess_, nullptr, resolvedId, count, data, aux, result), "IsNegative", id);
+    }
+    int greaterThan(int id, int count, const void* left, const void* right, const void* aux, void* result) const {
+        int resolvedId = id;
+        const GreaterThanFcn f =
+            functionAt(resolvedId, &DataType::greaterThanFcn_, &DataType::getGreaterThanFcn, "GreaterThanFcn");
+        return succeeded(f(dataTypeAccess_, nullptr, resolvedId, count, left, right, aux, result), "GreaterThan", id);
+    }
+    int greaterEqual(int id, int count, const void* left, const void* right, const void* aux, void* result) const {
+        int resolvedId = id;
+        const GreaterEqualFcn f =
+            functionAt(resolvedId, &DataType::greaterEqualFcn_, &DataType::getGreaterEqualFcn, "GreaterEqualFcn");
+        return succeeded(f(dataTypeAccess_, nullptr, resolvedId, count, left, right, aux, result), "GreaterEqual", id);
+    }
     /// Whether any value differs from the type's ground: doubles and singles by value, all else by bytes.
     bool checkIfNonZeroArray(const void* data, int count, int id, bool isComplex) const;
     /// setSize as a diagnostic. Null on success.
@@ -382,8 +402,26 @@ class QL_EXPORT DataTypeTable {
               const std::function<void()>& complete = {});
     void checkWithClient(DataType* record, const char* blockName);
     bool isNumeric(int id, int highestBuiltIn) const;
-    void convert(const DataType* chosen, int dstId, int srcId, int count, const void* src, const void* aux,
-                 void* dst) const;
+    void convert(int chosenId, int dstId, int srcId, int count, const void* src, const void* aux, void* dst) const;
+    [[noreturn]] void raiseMissingFcn(const char* name, int id) const;
+    [[noreturn]] void raiseFailedFcn(const char* operation, int id) const;
+    /// The function that the record at `id` has, or the failure that says that it has none; `id` becomes the one to
+    /// call it with. A record without a function of its own, such as an alias, is asked through its getters.
+    template <class F> F functionAt(int& id, F DataType::*own, F (DataType::*getter)() const, const char* name) const {
+        const DataType* record = recordAt(id);
+        if (record->*own) [[likely]]
+            return record->*own;
+        const F function = (record->*getter)();
+        if (!function) raiseMissingFcn(name, id);
+        id = record->getIdAliasedThruTo();
+        return function;
+    }
+    /// A function's answer, or the failure that it stands for when it is 0.
+    int succeeded(int answer, const char* operation, int id) const {
+        if (!answer) [[unlikely]]
+            raiseFailedFcn(operation, id);
+        return answer;
+    }
 };
 
 /// Prints through the table's virtual print().

@@ -51,38 +51,32 @@ bool DataTypeTable::isPositiveWithStatus(int id, int count, const void* data, co
 
 // --- Conversion and comparison ---------------------------------------------------------------------------------------
 
-namespace {
-
-// The function, or the failure that says that `record` has none.
-template <class F> F existing(F function, const char* name, const DataType* record) {
-    if (!function) failure::raise(QuillaneTypes::general::DataTypeFcnDoesNotExist(name, record->getName()));
-    return function;
+void DataTypeTable::raiseMissingFcn(const char* name, int id) const {
+    failure::raise(QuillaneTypes::general::DataTypeFcnDoesNotExist(name, recordAt(id)->getName()));
 }
 
-// A function's answer, or the failure that it stands for when it is 0.
-int succeeded(int answer, const char* operation, const DataType* record) {
-    if (!answer) failure::raise(QuillaneTypes::general::DataTypeFcnUnknownError(operation, record->getName()));
-    return answer;
+void DataTypeTable::raiseFailedFcn(const char* operation, int id) const {
+    failure::raise(QuillaneTypes::general::DataTypeFcnUnknownError(operation, recordAt(id)->getName()));
 }
 
-} // namespace
-
-void DataTypeTable::convert(const DataType* chosen, int dstId, int srcId, int count, const void* src, const void* aux,
+void DataTypeTable::convert(int chosenId, int dstId, int srcId, int count, const void* src, const void* aux,
                             void* dst) const {
-    const ConvertBetweenFcn f = existing(chosen->getConvertBetweenFcn(), "ConvertBetweenFcn", chosen);
+    int resolvedId = chosenId;
+    const ConvertBetweenFcn f =
+        functionAt(resolvedId, &DataType::convertBetweenFcn_, &DataType::getConvertBetweenFcn, "ConvertBetweenFcn");
     succeeded(f(dataTypeAccess_, nullptr, recordAt(dstId)->getIdAliasedThruTo(), recordAt(srcId)->getIdAliasedThruTo(),
                 count, src, aux, dst),
-              "ConvertBetween", chosen);
+              "ConvertBetween", chosenId);
 }
 
 void DataTypeTable::convertToUsingSrcId(int dstId, int srcId, int count, const void* src, const void* aux,
                                         void* dst) const {
-    convert(recordAt(srcId), dstId, srcId, count, src, aux, dst);
+    convert(srcId, dstId, srcId, count, src, aux, dst);
 }
 
 void DataTypeTable::convertToUsingDstId(int dstId, int srcId, int count, const void* src, const void* aux,
                                         void* dst) const {
-    convert(recordAt(dstId), dstId, srcId, count, src, aux, dst);
+    convert(dstId, dstId, srcId, count, src, aux, dst);
 }
 
 void DataTypeTable::sign(int id, const void* src, const void* aux, signed char* result) const {
@@ -91,40 +85,10 @@ void DataTypeTable::sign(int id, const void* src, const void* aux, signed char* 
     *result = value > 0.0 ? 1 : value == 0.0 ? 0 : -1; // kept: NaN is negative
 }
 
-void DataTypeTable::isPositive(int id, int count, const void* data, const void* aux, void* result) const {
-    const DataType* record = recordAt(id);
-    const IsPositiveFcn f = existing(record->getIsPositiveFcn(), "IsPositiveFcn", record);
-    succeeded(f(dataTypeAccess_, nullptr, record->getIdAliasedThruTo(), count, data, aux, result), "IsPositive",
-              record);
-}
-
 void DataTypeTable::isPositive(int id, const void* data, const void* aux, signed char* result) const {
     unsigned long answer = 0; // a type's function may write more than one byte
     isPositive(id, 1, data, aux, &answer);
     *result = answer != 0;
-}
-
-void DataTypeTable::isNegative(int id, int count, const void* data, const void* aux, void* result) const {
-    const DataType* record = recordAt(id);
-    const IsNegativeFcn f = existing(record->getIsNegativeFcn(), "IsNegativeFcn", record);
-    succeeded(f(dataTypeAccess_, nullptr, record->getIdAliasedThruTo(), count, data, aux, result), "IsNegative",
-              record);
-}
-
-int DataTypeTable::greaterThan(int id, int count, const void* left, const void* right, const void* aux,
-                               void* result) const {
-    const DataType* record = recordAt(id);
-    const GreaterThanFcn f = existing(record->getGreaterThanFcn(), "GreaterThanFcn", record);
-    return succeeded(f(dataTypeAccess_, nullptr, record->getIdAliasedThruTo(), count, left, right, aux, result),
-                     "GreaterThan", record);
-}
-
-int DataTypeTable::greaterEqual(int id, int count, const void* left, const void* right, const void* aux,
-                                void* result) const {
-    const DataType* record = recordAt(id);
-    const GreaterEqualFcn f = existing(record->getGreaterEqualFcn(), "GreaterEqualFcn", record);
-    return succeeded(f(dataTypeAccess_, nullptr, record->getIdAliasedThruTo(), count, left, right, aux, result),
-                     "GreaterEqual", record);
 }
 
 bool DataTypeTable::checkIfNonZeroArray(const void* data, int count, int id, bool isComplex) const {

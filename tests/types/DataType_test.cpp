@@ -496,6 +496,45 @@ TEST(DataType, ScalarOperationsCallTheFunctions) {
     EXPECT_EQ(t.serializeSizeScalarElement(&src), 7u);
 }
 
+// Functions of its own, without ever setting one.
+struct AnsweringType : DataType {
+    AnsweringType() : DataType(14, "Answering", dtSourceBuiltIn) {
+        plainConstruct_ = plainDestroy_ = plainCopy_ = false;
+    }
+    ConstructFcn getConstructFcn() const override { return succeeds ? writeConstructed : failToConstruct; }
+    DestructFcn getDestructFcn() const override {
+        return succeeds ? [](void* p) { return *static_cast<int*>(p) = 2; } : [](void*) { return 0; };
+    }
+    DeepCopyFcn getDeepCopyFcn() const override {
+        return succeeds ? [](void* p, const void*) { return *static_cast<int*>(p) = 3; }
+                        : [](void*, const void*) { return 0; };
+    }
+    const void* getProperties() const override { return "answered"; }
+    static int writeConstructed(void* p, const void* properties) {
+        propertiesSeen = properties;
+        return *static_cast<int*>(p) = 1;
+    }
+    static int failToConstruct(void*, const void*) { return 0; }
+    bool succeeds = true;
+};
+
+TEST(DataType, ARecordWithoutFunctionsIsAskedThroughItsGetters) {
+    AnsweringType t;
+    int v = 0;
+    t.constructScalarElement(&v);
+    EXPECT_EQ(v, 1);
+    EXPECT_STREQ(static_cast<const char*>(propertiesSeen), "answered");
+    t.destroyScalarElement(&v);
+    EXPECT_EQ(v, 2);
+    t.deepCopyScalarElement(&v, &v);
+    EXPECT_EQ(v, 3);
+    t.succeeds = false;
+    const std::string failed = id("DataTypeFcnUnknownError");
+    EXPECT_RAISES(t.constructScalarElement(&v), failed, "Construct", "Answering");
+    EXPECT_RAISES(t.destroyScalarElement(&v), failed, "Destruct", "Answering");
+    EXPECT_RAISES(t.deepCopyScalarElement(&v, &v), failed, "DeepCopy", "Answering");
+}
+
 TEST(DataType, AFailedFunctionIsReportedByOperation) {
     DataType t(14, "Plain", dtSourceBuiltIn);
     t.setConstructFcn([](void*, const void*) { return 0; });
