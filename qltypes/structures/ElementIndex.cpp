@@ -105,8 +105,8 @@ ElementIndex& ElementIndex::current() {
         raw_.prepare(numImmediate(), [this](long i) { return rawEnd(i); });
         askedElements_.reset(numbering_.numDFS); // now that it has another number of nodes
         root_ = nullptr;
-        renew(offset_);
-        renew(varDimsOffset_);
+        offset_.numMoved = 0;
+        varDimsOffset_.isUncopied = true; // few ask for them: no walk over all elements before the first does
     }
     readAt_ = numbering_.invalidTypeId ? 0 : now;
     return *this;
@@ -141,7 +141,7 @@ ElementIndex::Numbering ElementIndex::read() const {
                 wrappingAdd(lastNode, width > 1 ? wrappingAdd(wrappingMultiply(width, type.numDFS), 1) : type.numDFS);
             raw = wrappingAdd(raw, wrappingMultiply(width, type.numRaw));
         }
-        made.elements.push_back({element, lastNode, 0, position});
+        made.elements.push_back({element, lastNode, element->offset, position});
         made.raw.push_back(raw);
     }
     return made;
@@ -278,6 +278,7 @@ long ElementIndex::varDimsOffset(long idx) { return sum(idx, &ElementIndex::varD
 
 long ElementIndex::sum(long idx, Summands ElementIndex::*which) {
     Summands& what = this->*which;
+    if (what.isUncopied) renew(what);
     CachedElement* const answer = findWritten(idx);
     if (answer && answer->*what.answer != -1) return answer->*what.answer;
     const Place at = place(idx);
@@ -321,6 +322,7 @@ long ElementIndex::sum(long idx, Summands ElementIndex::*which) {
 void ElementIndex::renew(Summands& what) {
     writeDown(what);
     what.numMoved = 0;
+    what.isUncopied = false;
     varDimsOffsets_.resize(numbering_.elements.size());
     for (long i = 0; i < numImmediate(); ++i)
         copyOf(i, what) = immediate(i).*what.field;

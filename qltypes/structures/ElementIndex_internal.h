@@ -160,6 +160,7 @@ class ElementIndex {
         const bool countsInstances;
         AskedSet asked = {};
         AskedSet askedOverUnset = {}; // those whose nested answer was -1, which the nested structure does not keep
+        bool isUncopied = false;      // the copy is older than the numbering, and nothing was asked since
         long numMoved = 0;            // answers written down because their field differs from the copy
 
         bool wasAsked(long idx) const { return asked.contains(idx) || askedOverUnset.contains(idx); }
