@@ -11,20 +11,24 @@ namespace {
 // Runs up to this many elements go straight to the level: they are far from leaving the caches.
 constexpr std::size_t shortRun = 1 << 16;
 
+// What takes more than one run; kept out of the way of what does not.
+[[gnu::noinline]] bool convertOtherwise(const Cell& cell, const void* src, void* dst, std::size_t srcCount,
+                                        std::size_t dstCount, bool srcComplex, bool dstComplex, bool check) {
+    const Vectors vectors = {
+        static_cast<const std::byte*>(src), static_cast<std::byte*>(dst), srcCount, dstCount, srcComplex, dstComplex};
+    return convertInLayout(cell, vectors, check);
+}
+
 // One function of the matrix.
 template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
 bool convertVector(const void* src, void* dst, std::size_t srcCount, std::size_t dstCount, bool srcComplex,
                    bool dstComplex, bool check, int, int, fxpModeOverflow_tag, fxpModeRounding_tag) {
     constexpr const Cell& cell = cellOf<S, D, rounding, overflow>;
-    const Vectors vectors = {
-        static_cast<const std::byte*>(src), static_cast<std::byte*>(dst), srcCount, dstCount, srcComplex, dstComplex};
     const bool checked = check && !holdsEveryValue<S, D>();
     const bool steps = srcCount > 1 || dstCount == 1;
-    if (!checked && !srcComplex && !dstComplex && steps && dstCount - 1 < shortRun) {
-        levelInUse->convert[cell.slot](vectors.src, vectors.dst, dstCount);
-        return true;
-    }
-    return convertInLayout(cell, vectors, checked);
+    if (checked || srcComplex || dstComplex || !steps || dstCount - 1 >= shortRun) [[unlikely]]
+        return convertOtherwise(cell, src, dst, srcCount, dstCount, srcComplex, dstComplex, checked);
+    return levelInUse->convert[cell.slot](static_cast<const std::byte*>(src), static_cast<std::byte*>(dst), dstCount);
 }
 
 // Booleans are read as uint8 and share its functions, but for the copy to int8.
@@ -37,6 +41,18 @@ constexpr SlotTable<BuiltInConvFcn> functions = slotTable<BuiltInConvFcn>(
         return &convertVector<SourceOf<S, D>, DestinationOf<S, D>, rounding, overflow>;
     });
 
+// What slotOf() needs of a pair, in one word and without a branch.
+struct CellAxes {
+    std::uint16_t firstSlot;
+    std::uint8_t roundingMask;
+    std::uint8_t overflowMask;
+};
+
+constexpr PairTable<CellAxes> cellAxes = pairTable<CellAxes>([]<class S, class D> {
+    return CellAxes{firstSlots[idOf<S>][idOf<D>], roundingMatters<S, D> ? std::uint8_t{0xff} : std::uint8_t{0},
+                    overflowMatters<S, D>};
+});
+
 } // namespace
 
 } // namespace QLTypeSys::conversion
@@ -47,5 +63,9 @@ BuiltInConvFcn utGetQlBuiltinDtypeConvFcn(int srcId, int dstId, fxpModeOverflow_
     QLTYPES_ASSERT(srcId >= 0 && srcId < numTypes && dstId >= 0 && dstId < numTypes);
     QLTYPES_ASSERT(overflow == FXP_OVERFLOW_WRAP || overflow == FXP_OVERFLOW_SATURATE);
     QLTYPES_ASSERT(rounding >= FXP_ROUND_ZERO && rounding <= FXP_ROUND_HALF_EVEN);
-    return functions[slotOf(srcId, dstId, overflow, rounding)];
+    const CellAxes axes = cellAxes[srcId][dstId];
+    const unsigned variant =
+        (2u * static_cast<unsigned>(rounding) & (rounding == FXP_ROUND_AS_ZERO ? 0u : axes.roundingMask)) +
+        (static_cast<unsigned>(overflow) & axes.overflowMask);
+    return functions[axes.firstSlot + variant];
 }

@@ -28,6 +28,7 @@ struct PortableRuns {
                 for (std::size_t i = 0; i < count; ++i)
                     storeElement(dst, i, converted<S, D, rounding, overflow>(loadElement<S>(src, i)));
             }
+            return true;
         };
     }
 

@@ -12,8 +12,9 @@
 
 namespace QLTypeSys::conversion {
 
-/// Converts `count` elements. `src` and `dst` need no alignment; they may be equal where the element sizes are.
-using ConvertRun = void (*)(const std::byte* src, std::byte* dst, std::size_t count);
+/// Converts `count` elements. `src` and `dst` need no alignment; they may be equal where the element sizes are. The
+/// answer is always true: so that a conversion without a check can end with its run.
+using ConvertRun = bool (*)(const std::byte* src, std::byte* dst, std::size_t count);
 
 /// Converts elements as long as each equals what is written for it. Returns how many were converted: all, or the first
 /// ones up to somewhere before the first that is lost. No mode counts for an element that is kept.

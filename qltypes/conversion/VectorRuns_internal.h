@@ -190,8 +190,9 @@ template <class Vectors> struct VectorRuns {
     using Losses = typename std::conditional_t<isFloating<S>, typename Vectors::template FloatingLosses<S, D>,
                                                IntegerLosses<Vectors, S, D>>;
 
-    template <std::size_t size> static void copyRun(const std::byte* src, std::byte* dst, std::size_t count) {
+    template <std::size_t size> static bool copyRun(const std::byte* src, std::byte* dst, std::size_t count) {
         std::memmove(dst, src, count * size);
+        return true;
     }
 
     // The registers of a pair: as many elements as fill one on the wider side.
@@ -205,7 +206,7 @@ template <class Vectors> struct VectorRuns {
     }
 
     template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
-    static void convertRegisters(const std::byte* src, std::byte* dst, std::size_t count) {
+    static bool convertRegisters(const std::byte* src, std::byte* dst, std::size_t count) {
         constexpr std::size_t perRegister = lanes<S, D>, unrolled = 4;
         constexpr std::size_t srcBytes = perRegister * sizeof(S), dstBytes = perRegister * sizeof(D);
         const auto convertRegister = [&](std::size_t k) {
@@ -228,6 +229,7 @@ template <class Vectors> struct VectorRuns {
             Vectors::template store<dstBytes>(dst, Vectors::template converted<S, D, rounding, overflow>(loaded),
                                               count * sizeof(D));
         }
+        return true;
     }
 
     // Nothing is written before all that is read is known to be kept: the source may be the destination.
