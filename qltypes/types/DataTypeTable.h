@@ -312,25 +312,30 @@ class QL_EXPORT DataTypeTable {
     void convertToUsingDstId(int dstId, int srcId, int count, const void* src, const void* aux, void* dst) const;
     /// 1 above zero, 0 for zero, -1 for all else, NaN included.
     void sign(int id, const void* src, const void* aux, signed char* result) const;
+    /// Whether each value is above zero.
     void isPositive(int id, int count, const void* data, const void* aux, void* result) const {
         int resolvedId = id;
         const IsPositiveFcn f =
             functionAt(resolvedId, &DataType::isPositiveFcn_, &DataType::getIsPositiveFcn, "IsPositiveFcn");
         succeeded(f(dataTypeAccess_, nullptr, resolvedId, count, data, aux, result), "IsPositive", id);
     }
+    /// The same of one value.
     void isPositive(int id, const void* data, const void* aux, signed char* result) const;
+    /// Whether each value is below zero.
     void isNegative(int id, int count, const void* data, const void* aux, void* result) const {
         int resolvedId = id;
         const IsNegativeFcn f =
             functionAt(resolvedId, &DataType::isNegativeFcn_, &DataType::getIsNegativeFcn, "IsNegativeFcn");
         succeeded(f(dataTypeAccess_, nullptr, resolvedId, count, data, aux, result), "IsNegative", id);
     }
+    /// Whether each left value is greater than the right one. What the type's function answers, which is not 0.
     int greaterThan(int id, int count, const void* left, const void* right, const void* aux, void* result) const {
         int resolvedId = id;
         const GreaterThanFcn f =
             functionAt(resolvedId, &DataType::greaterThanFcn_, &DataType::getGreaterThanFcn, "GreaterThanFcn");
         return succeeded(f(dataTypeAccess_, nullptr, resolvedId, count, left, right, aux, result), "GreaterThan", id);
     }
+    /// Whether each left value is at least the right one. What the type's function answers, which is not 0.
     int greaterEqual(int id, int count, const void* left, const void* right, const void* aux, void* result) const {
         int resolvedId = id;
         const GreaterEqualFcn f =
