@@ -13,10 +13,11 @@ namespace QLTypeSys::conversion {
 namespace {
 
 // Where a vector takes two steps it takes them in blocks that stay in the first-level cache. Blocks on their way past
-// the caches are short, so that reading and writing overlap, and the source is called for a page ahead.
+// the caches are short, so that reading and writing overlap, and the source of the next is called for.
 constexpr std::size_t blockBytes = 4096;
 constexpr std::size_t passingBlockBytes = 1024;
-constexpr std::size_t bytesAhead = 4096;
+constexpr std::size_t pageBytes = 4096;
+constexpr std::size_t numPages = 4;
 constexpr std::size_t lineBytes = 64;
 
 struct alignas(lineBytes) Block {
@@ -75,7 +76,7 @@ class Conversion {
     Conversion(const Cell& cell, const Vectors& vectors, bool check)
         : cell_(cell), vectors_(vectors), run_(levelInUse->convert[cell.slot]),
           convertWhileKept_(check ? levelInUse->convertWhileKept[cell.srcId][cell.dstId] : nullptr),
-          pastCaches_(vectors.src != vectors.dst && writtenBytes() > cachedBytes) {}
+          pastCaches_(vectors.src != vectors.dst && readBytes() + writtenBytes() > cachedBytes) {}
 
     bool run() {
         const bool hasOneSource = cell_.joinsParts ? vectors_.srcCount == 1 : vectors_.srcCount <= 1;
@@ -95,6 +96,9 @@ class Conversion {
 
   private:
     bool dstComplex() const { return vectors_.dstComplex && !cell_.joinsParts; }
+    std::size_t readBytes() const {
+        return vectors_.srcCount > 1 ? (vectors_.dstCount * cell_.srcSize) << vectors_.srcComplex : 0;
+    }
     std::size_t writtenBytes() const { return (vectors_.dstCount * cell_.dstSize) << dstComplex(); }
 
     // Converts a run and notes whether something was lost; the first loss settles it.
@@ -116,33 +120,44 @@ class Conversion {
             kept_ = !pairsOfSize(cell_.srcSize).anyImaginary(pairs, count, cell_.hasSignedZero);
     }
 
-    // Takes the elements in blocks, `srcBytes` and `dstBytes` of each: step(from, to, count). What goes past the caches
-    // is made in a block first and leaves in whole lines.
+    // Takes the elements in blocks, `srcBytes` and `dstBytes` of each: step(from, to, count).
     template <class Step> void inBlocks(std::size_t srcBytes, std::size_t dstBytes, Step step) {
-        const std::byte* src = vectors_.src;
-        std::byte* dst = vectors_.dst;
-        const std::size_t wider = std::max(srcBytes, dstBytes);
-        const std::size_t perBlock = (pastCaches_ ? passingBlockBytes : blockBytes) / wider;
-        const std::size_t toWholeLine = -reinterpret_cast<std::uintptr_t>(dst) % lineBytes / dstBytes;
-        std::size_t count = pastCaches_ && toWholeLine ? std::min(toWholeLine, perBlock) : perBlock;
-        for (std::size_t left = vectors_.dstCount; left; left -= count, count = perBlock) {
-            count = std::min(count, left);
-            if (pastCaches_) {
-                callForSource(src, count * srcBytes);
-                step(src, outgoing_.bytes, count);
-                levelInUse->copyToMemory(outgoing_.bytes, dst, count * dstBytes);
-            } else {
-                step(src, dst, count);
-            }
-            src += count * srcBytes;
-            dst += count * dstBytes;
-        }
+        if (pastCaches_) return inPassingBlocks(srcBytes, dstBytes, step);
+        const std::size_t perBlock = blockBytes / std::max(srcBytes, dstBytes);
+        for (std::size_t done = 0; done < vectors_.dstCount; done += perBlock)
+            step(vectors_.src + done * srcBytes, vectors_.dst + done * dstBytes,
+                 std::min(perBlock, vectors_.dstCount - done));
     }
 
-    static void callForSource(const std::byte* src, std::size_t bytes) {
-        const std::uintptr_t ahead = reinterpret_cast<std::uintptr_t>(src) + bytesAhead; // also beyond the end
+    // What goes past the caches is made in a block first and leaves in whole lines. Memory answers faster when several
+    // pages are read at once: blocks of four pages in turn, as long as there are so many.
+    template <class Step> void inPassingBlocks(std::size_t srcBytes, std::size_t dstBytes, Step step) {
+        const std::size_t wider = std::max(srcBytes, dstBytes);
+        const std::size_t perBlock = passingBlockBytes / wider, perPage = pageBytes / wider;
+        const auto pass = [&](std::size_t first, std::size_t count, std::size_t next) {
+            if (srcBytes >= dstBytes) callForSource(next * srcBytes, count * srcBytes);
+            step(vectors_.src + first * srcBytes, outgoing_.bytes, count);
+            levelInUse->copyToMemory(outgoing_.bytes, vectors_.dst + first * dstBytes, count * dstBytes);
+        };
+        const std::size_t all = vectors_.dstCount;
+        const std::size_t toWholeLine = -reinterpret_cast<std::uintptr_t>(vectors_.dst) % lineBytes / dstBytes;
+        std::size_t done = std::min(toWholeLine, all);
+        if (done) pass(0, done, done);
+        for (; done + numPages * perPage <= all; done += numPages * perPage)
+            for (std::size_t block = 0; block < perPage; block += perBlock)
+                for (std::size_t page = 0; page < numPages; ++page) {
+                    const std::size_t first = done + page * perPage + block;
+                    const bool isLast = block + perBlock == perPage;
+                    pass(first, perBlock, first + perBlock + (isLast ? (numPages - 1) * perPage : 0));
+                }
+        for (; done < all; done += perBlock)
+            pass(done, std::min(perBlock, all - done), done + perBlock);
+    }
+
+    void callForSource(std::size_t offset, std::size_t bytes) const {
+        const auto from = reinterpret_cast<std::uintptr_t>(vectors_.src) + offset; // also beyond the end
         for (std::size_t line = 0; line < bytes; line += lineBytes)
-            __builtin_prefetch(reinterpret_cast<const void*>(ahead + line), 0, 0);
+            __builtin_prefetch(reinterpret_cast<const void*>(from + line));
     }
 
     void flat() {

@@ -5,7 +5,7 @@
 namespace QLTypeSys::conversion {
 
 constinit const Level* levelInUse = &portableLevel;
-constinit std::size_t cachedBytes = std::size_t{32} << 20;
+constinit std::size_t cachedBytes = std::size_t{16} << 20;
 
 std::span<const Level* const> availableLevels() {
 #ifdef __x86_64__
@@ -29,7 +29,7 @@ namespace {
 // Both values are right before this runs, so that other initialisers may convert.
 [[gnu::constructor]] void suitThisMachine() {
     levelInUse = availableLevels().back();
-    if (const long told = sysconf(_SC_LEVEL3_CACHE_SIZE); told > 0) cachedBytes = static_cast<std::size_t>(told);
+    if (const long told = sysconf(_SC_LEVEL3_CACHE_SIZE); told > 0) cachedBytes = static_cast<std::size_t>(told) / 2;
 }
 
 } // namespace

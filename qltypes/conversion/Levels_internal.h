@@ -73,7 +73,8 @@ std::span<const Level* const> availableLevels();
 /// The widest of them; the portable one until the library's initialisers have run. Tests set it.
 extern const Level* levelInUse;
 
-/// Destinations of more bytes are written past the caches: the size of the last-level cache. Tests set it.
+/// Where source and destination have more bytes together, the destination is written past the caches: half of the
+/// last-level cache, which is shared with others. Tests set it.
 extern std::size_t cachedBytes;
 
 } // namespace QLTypeSys::conversion

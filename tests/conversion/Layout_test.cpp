@@ -306,8 +306,10 @@ TEST(ConversionLayout, LongVectorsPastTheCaches) {
     onEachLevel([](const Level& level) {
         for (const std::size_t slot :
              {slotOf(0, 2, FXP_OVERFLOW_SATURATE, FXP_ROUND_FLOOR), slotOf(3, 0, FXP_OVERFLOW_WRAP, FXP_ROUND_ZERO),
-              slotOf(6, 7, FXP_OVERFLOW_SATURATE, FXP_ROUND_ZERO)}) {
+              slotOf(6, 7, FXP_OVERFLOW_SATURATE, FXP_ROUND_ZERO), slotOf(1, 8, FXP_OVERFLOW_WRAP, FXP_ROUND_ZERO)}) {
             const SlotReference& reference = slotReferences[slot];
+            expectEveryLayout(reference, level, reference.mixedValues(), 21003); // several pages in turn, and a rest
+            ASSERT_FALSE(HasFatalFailure());
             const Call call = {nullptr, nullptr, 70001, 70001, false, false, false};
             expectLikeLoop(reference, pick(reference.mixedValues(), reference.srcSize, 70001, 1), call, 3);
             ASSERT_FALSE(HasFatalFailure()) << callText(reference, level, call);
