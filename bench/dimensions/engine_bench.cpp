@@ -136,6 +136,18 @@ template <class System> void squaredFortyTimes(benchmark::State& state) {
     state.SetItemsProcessed(state.iterations() * 100);
 }
 
+// As wide as GiNaC normalises in a bench's time.
+template <class System> void sumOf1000(benchmark::State& state) {
+    for (auto _ : state) {
+        System s;
+        auto sum = s.symbol(0);
+        for (int i = 1; i < 1000; ++i)
+            sum = s.add(sum, s.multiply(s.number(2), s.symbol(i)));
+        benchmark::DoNotOptimize(s.simplified(sum));
+    }
+    state.SetItemsProcessed(state.iterations() * 1000);
+}
+
 void engineWideSum(benchmark::State& state) {
     for (auto _ : state) {
         Engine s;
@@ -208,6 +220,7 @@ QLTYPES_BENCH_BOTH(sumsOf50);
 QLTYPES_BENCH_BOTH(productsOf50);
 QLTYPES_BENCH_BOTH(deepNests);
 QLTYPES_BENCH_BOTH(squaredFortyTimes);
+QLTYPES_BENCH_BOTH(sumOf1000);
 BENCHMARK(engineWideSum)->Unit(benchmark::kMillisecond);
 #ifdef QLTYPES_HAVE_GINAC
 BENCHMARK(ginacWideSum)->Unit(benchmark::kMillisecond);
