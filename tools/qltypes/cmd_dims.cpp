@@ -52,8 +52,9 @@ nlohmann::ordered_json answerJson(const Statement& statement, const Answer& answ
         nlohmann::ordered_json against = nlohmann::ordered_json::array();
         for (const ScriptPart& earlier : answer.contradiction->against)
             against.push_back({{"line", earlier.line}, {"statement", earlier.text}});
-        json["refused"] = {
-            {"identifier", answer.contradiction->identifier}, {"message", answer.contradiction->message}, {"contradicts", against}};
+        json["refused"] = {{"identifier", answer.contradiction->identifier},
+                           {"message", answer.contradiction->message},
+                           {"contradicts", against}};
     }
     return json;
 }
