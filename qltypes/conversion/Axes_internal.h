@@ -102,12 +102,23 @@ inline constexpr PairTable<std::uint16_t> firstSlots = [] {
 }();
 inline constexpr std::size_t numSlots = firstSlots[booleanId][booleanId] + numVariants<Boolean, Boolean>;
 
+/// What slotOf() needs of a pair, in one word and without a branch.
+struct CellAxes {
+    std::uint16_t firstSlot;
+    std::uint8_t roundingMask;
+    std::uint8_t overflowMask;
+};
+
+inline constexpr PairTable<CellAxes> cellAxes = pairTable<CellAxes>([]<class S, class D> {
+    return CellAxes{firstSlots[idOf<S>][idOf<D>], roundingMatters<S, D> ? std::uint8_t{0xff} : std::uint8_t{0},
+                    overflowMatters<S, D>};
+});
+
 /// The slot of a conversion: the flags decide which of the two modes count.
 constexpr std::size_t slotOf(int srcId, int dstId, fxpModeOverflow_tag overflow, fxpModeRounding_tag rounding) {
-    std::size_t variant = 0;
-    if (roundingFlags[srcId][dstId] && rounding != FXP_ROUND_AS_ZERO) variant = 2 * static_cast<std::size_t>(rounding);
-    if (overflowFlags[srcId][dstId]) variant += static_cast<std::size_t>(overflow);
-    return firstSlots[srcId][dstId] + variant;
+    const CellAxes axes = cellAxes[srcId][dstId];
+    const unsigned direction = rounding == FXP_ROUND_AS_ZERO ? 0u : 2u * static_cast<unsigned>(rounding);
+    return axes.firstSlot + (direction & axes.roundingMask) + (static_cast<unsigned>(overflow) & axes.overflowMask);
 }
 
 /// What stands in a slot. Modes that do not count are FXP_ROUND_ZERO and FXP_OVERFLOW_WRAP; FXP_ROUND_AS_ZERO is

@@ -41,18 +41,6 @@ constexpr SlotTable<BuiltInConvFcn> functions = slotTable<BuiltInConvFcn>(
         return &convertVector<SourceOf<S, D>, DestinationOf<S, D>, rounding, overflow>;
     });
 
-// What slotOf() needs of a pair, in one word and without a branch.
-struct CellAxes {
-    std::uint16_t firstSlot;
-    std::uint8_t roundingMask;
-    std::uint8_t overflowMask;
-};
-
-constexpr PairTable<CellAxes> cellAxes = pairTable<CellAxes>([]<class S, class D> {
-    return CellAxes{firstSlots[idOf<S>][idOf<D>], roundingMatters<S, D> ? std::uint8_t{0xff} : std::uint8_t{0},
-                    overflowMatters<S, D>};
-});
-
 } // namespace
 
 } // namespace QLTypeSys::conversion
@@ -63,9 +51,5 @@ BuiltInConvFcn utGetQlBuiltinDtypeConvFcn(int srcId, int dstId, fxpModeOverflow_
     QLTYPES_ASSERT(srcId >= 0 && srcId < numTypes && dstId >= 0 && dstId < numTypes);
     QLTYPES_ASSERT(overflow == FXP_OVERFLOW_WRAP || overflow == FXP_OVERFLOW_SATURATE);
     QLTYPES_ASSERT(rounding >= FXP_ROUND_ZERO && rounding <= FXP_ROUND_HALF_EVEN);
-    const CellAxes axes = cellAxes[srcId][dstId];
-    const unsigned variant =
-        (2u * static_cast<unsigned>(rounding) & (rounding == FXP_ROUND_AS_ZERO ? 0u : axes.roundingMask)) +
-        (static_cast<unsigned>(overflow) & axes.overflowMask);
-    return functions[axes.firstSlot + variant];
+    return functions[slotOf(srcId, dstId, overflow, rounding)];
 }
