@@ -250,13 +250,14 @@ class Page(unittest.TestCase):
         self.browser.type("#tree", "\ue010")  # to the end
         self.browser.wait("return document.querySelector('#tree .entry:last-child .name')?.innerText === 'Mode'")
         self.browser.type("#search", "channel_9999")
-        self.browser.wait("return document.querySelector('#found').innerText.startsWith('1 result')")
+        self.browser.wait("return document.querySelector('#tree .entry .name')?.innerText === 'channel_9999'")
         self.browser.type("#search", ENTER)
         self.assertEqual(self.browser.run(SELECTED), ["channel_9999"])
         self.browser.click("#tab-numbers")
         self.assertEqual(self.browser.texts("#numbers .chosen span")[-1], "channel_9999")
         self.browser.type("#search", ESCAPE)
-        self.browser.wait("return document.querySelector('#tree .chosen .name')?.innerText === 'channel_9999'")
+        self.browser.wait("return document.querySelector('#found').innerText === ''")  # the tree again, no longer the results
+        self.assertEqual(self.browser.texts("#tree .chosen .name"), ["channel_9999"])
         self.assertLess(self.browser.run(count), few)
         for path, offset in (("#Many:cells(1999).mode", 1999 * 24 + 20), ("#Huge:cells(79999999).mode", 79999999 * 24 + 20)):
             self.browser.run("location.hash = arguments[0]", path)
