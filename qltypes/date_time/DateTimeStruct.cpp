@@ -10,6 +10,8 @@
 #include "qltypes/date_time/Text_internal.h"
 #include "qltypes/host/Failure_internal.h"
 
+namespace failure = QLTypeSys::failure;
+
 namespace QLDateTime {
 
 namespace {
@@ -63,7 +65,9 @@ constexpr FieldRange cFieldRanges[] = {
 };
 constexpr unsigned char cGreatestSecond = 60;
 
-[[noreturn]] void raiseInvalidTimeValue() { QLTypeSys::failure::raise("Quillane:DateTime", "InvalidTimeValue"); }
+[[noreturn]] void raiseInvalidTimeValue() {
+    failure::raise(failure::diagnosticOf(failure::message("Quillane:DateTime", "InvalidTimeValue")));
+}
 
 } // namespace
 

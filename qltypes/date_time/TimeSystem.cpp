@@ -4,6 +4,8 @@
 
 #include "qltypes/host/Failure_internal.h"
 
+namespace failure = QLTypeSys::failure;
+
 namespace QLDateTime {
 
 namespace {
@@ -90,17 +92,19 @@ void TimeSystem::checkEpoch(const DateTimeStruct& epoch) const {
     const TimeSystem standard(scale_);
     if (!liesOutside(epoch, epoch, standard.range_)) return;
     const auto [first, last] = standard.getRangeStr();
-    QLTypeSys::failure::raise("Quillane:DateTime", "InvalidTimeEpoch", getTimeScaleStr(), first, last,
-                              epoch.getDateTimeStr());
+    failure::raise(failure::diagnosticOf(failure::message("Quillane:DateTime", "InvalidTimeEpoch", getTimeScaleStr(),
+                                                          first, last, epoch.getDateTimeStr())));
 }
 
 void TimeSystem::checkRange(const std::pair<DateTimeStruct, DateTimeStruct>& range) const {
-    if (range.second.isEarlierThan(range.first)) QLTypeSys::failure::raise("Quillane:DateTime", "InvalidRange");
+    if (range.second.isEarlierThan(range.first))
+        failure::raise(failure::diagnosticOf(failure::message("Quillane:DateTime", "InvalidRange")));
     const TimeSystem standard(scale_);
     if (!liesOutside(range.first, range.second, standard.range_)) return;
     const auto [first, last] = standard.getRangeStr();
-    QLTypeSys::failure::raise("Quillane:DateTime", "InvalidTimeRange", getTimeScaleStr(), first, last,
-                              range.first.getDateTimeStr(), range.second.getDateTimeStr());
+    failure::raise(
+        failure::diagnosticOf(failure::message("Quillane:DateTime", "InvalidTimeRange", getTimeScaleStr(), first, last,
+                                               range.first.getDateTimeStr(), range.second.getDateTimeStr())));
 }
 
 bool TimeSystem::isEqual(const TimeSystem& other) const {

@@ -5,6 +5,8 @@
 #include "qltypes/date_time/Text_internal.h"
 #include "qltypes/host/Failure_internal.h"
 
+namespace failure = QLTypeSys::failure;
+
 namespace QLDateTime {
 
 TimeZone::TimeZone(signed char hours_, signed char minutes_) { setTimeZone(hours_, minutes_); }
@@ -27,7 +29,7 @@ std::vector<double> TimeZone::validateAndConvertToVector(const double* v) {
     const bool isOffset = isWholeNumber(h) && isWholeNumber(m) && h >= -12 && h <= 14 &&
                           (m == 0 || m == 30 || m == -30 || m == 45) && // kept: there is no -45
                           !(h < 0 && m > 0) && !(m < 0 && h > 0);
-    if (!isOffset) QLTypeSys::failure::raise("Quillane:DateTime", "InvalidTimeZoneValue");
+    if (!isOffset) failure::raise(failure::diagnosticOf(failure::message("Quillane:DateTime", "InvalidTimeZoneValue")));
     return {h, m};
 }
 

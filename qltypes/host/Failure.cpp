@@ -4,19 +4,20 @@
 
 namespace QLTypeSys::failure {
 
-void raise(const resource_core::BaseMsgID& message) {
-    qlsvDiagnosticImpl* diagnostic = diagnosticOf(message);
-    qlsvThrowIExceptionFromDiagnostic(diagnostic, nullptr);
-}
+void raise(const resource_core::BaseMsgID& message) { raise(diagnosticToRaise(message)); }
 
-void raiseOutOfMemory() {
-    qlsvDiagnosticImpl* diagnostic = qlsvCreateOutOfMemoryDiagnostic();
-    qlsvThrowIExceptionFromDiagnostic(diagnostic, nullptr);
+void raise(qlsvDiagnosticImpl* diagnostic) { qlsvThrowIExceptionFromDiagnostic(diagnostic, nullptr); }
+
+void raiseOutOfMemory() { raise(qlsvCreateOutOfMemoryDiagnostic()); }
+
+qlsvDiagnosticImpl* diagnosticToRaise(const resource_core::BaseMsgID& message) {
+    QLTYPES_ASSERT(isInCatalogue(message));
+    return qlsvCreateDiagnosticFromMessageID(message);
 }
 
 qlsvDiagnosticImpl* diagnosticOf(const resource_core::BaseMsgID& message) {
     QLTYPES_ASSERT(isInCatalogue(message));
-    return qlsvCreateDiagnosticFromMessageID(message);
+    return qlsvCreateDiagnostic(message, "");
 }
 
 void append(qlsvDiagnosticImpl*& first, qlsvDiagnosticImpl* behind) {

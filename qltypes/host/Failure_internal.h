@@ -14,13 +14,22 @@ template <class... Args> [[noreturn]] void raise(const char* category, const cha
     raise(message(category, leaf, std::forward<Args>(args)...));
 }
 
+/// Throws a diagnostic, which the exception takes over.
+[[noreturn]] void raise(qlsvDiagnosticImpl* diagnostic);
+
 /// Throws the out-of-memory diagnostic.
 [[noreturn]] void raiseOutOfMemory();
 
 /// Throws a diagnostic that a function returned; nothing for null.
 inline void passOn(qlsvDiagnosticImpl* diagnostic) {
-    if (diagnostic) qlsvThrowIExceptionFromDiagnostic(diagnostic, nullptr);
+    if (diagnostic) raise(diagnostic);
 }
+
+// The services make diagnostics in two ways, which a platform may tell apart: those that are raised, and those that
+// name the component which returns them. No component has a name here.
+
+/// A diagnostic that holds the message, as raise() makes it.
+qlsvDiagnosticImpl* diagnosticToRaise(const resource_core::BaseMsgID& message);
 
 /// A diagnostic that holds the message, for functions that return it instead of throwing.
 qlsvDiagnosticImpl* diagnosticOf(const resource_core::BaseMsgID& message);
