@@ -319,7 +319,7 @@ void DataTypeTable::throwDataTypeNameIntrinsicFixptError(const char* name) {
 }
 
 bool DataTypeTable::isInstrinsicFixptName(const char* name, int* wordLength) {
-    const bool isFixpt = FXP::isQLTypeNameNumericNotBuiltInClassic9(name);
+    const bool isFixpt = name && FXP::isQLTypeNameNumericNotBuiltInClassic9(name);
     if (isFixpt && wordLength) *wordLength = FXP::getWordLengthFromTypeName(name);
     return isFixpt;
 }
@@ -381,6 +381,7 @@ int DataTypeTable::enter(std::unique_ptr<DataType> record, int existing, const c
             if (existing == DATA_TYPE_ID_INVALID) dataTypeIdsByName_->erase(entered->getName());
             dataTypes_.pop_back();
             delete entered;
+            noteStructureEdit();
             throw;
         }
     };
@@ -414,6 +415,7 @@ void DataTypeTable::removeDataType(DataType* record) {
     dataTypeIdsByName_->erase(record->getName());
     delete dataTypes_.back();
     dataTypes_.pop_back();
+    noteStructureEdit(); // the next type under this id may be of another kind
 }
 
 qlsvDiagnosticImpl* DataTypeTable::RegisterDataType(DataTypeTable* table, const char* blockName, const char* name,
@@ -421,7 +423,8 @@ qlsvDiagnosticImpl* DataTypeTable::RegisterDataType(DataTypeTable* table, const 
     qlsvDiagnosticImpl* diagnostic =
         failure::diagnosticFrom([&] { *id = table->registerDataType(name, source, blockName); });
     if (diagnostic && utStrlen(blockName) != 0)
-        failure::append(diagnostic, failure::diagnosticOf(QuillaneTypes::general::DataTypeErrorFromBlock(blockName)));
+        failure::append(diagnostic,
+                        failure::diagnosticToRaise(QuillaneTypes::general::DataTypeErrorFromBlock(blockName)));
     return diagnostic;
 }
 

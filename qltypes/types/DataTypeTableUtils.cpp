@@ -24,6 +24,8 @@ bool has(const DataTypeTable* table, int id, F (DataType::*function)() const,
     return (type->*function)() != nullptr || !(type->*name)().empty();
 }
 
+std::string textOf(const char* name) { return name ? name : ""; }
+
 template <class Parameter, class Value>
 qlsvDiagnosticImpl* set(DataTypeTable* table, int id, void (DataType::*setter)(Parameter), const Value& value) {
     return failure::diagnosticFrom([&] { (record(table, id)->*setter)(value); });
@@ -57,7 +59,7 @@ CG::Type* DtGetDataTypeCGType(const QLTypeSys::DataTypeTable* table, int id) { r
 bool DtGetIsPointerType(const QLTypeSys::DataTypeTable* table, int id) { return record(table, id)->getIsPointerType(); }
 void DtSetDataTypeCGType(QLTypeSys::DataTypeTable* table, int id, CG::Type* type) { record(table, id)->setCGType(type); }
 void DtSetDataTypeGroundHasNonZeroStoredValue(QLTypeSys::DataTypeTable* table, int id, bool hasNonZero) { record(table, id)->setGroundHasNonZeroStoredValue(hasNonZero); }
-void DtSetDataTypeShortName(QLTypeSys::DataTypeTable* table, int id, const char* name) { record(table, id)->setShortName(name); }
+void DtSetDataTypeShortName(QLTypeSys::DataTypeTable* table, int id, const char* name) { record(table, id)->setShortName(textOf(name)); }
 
 // --- Resolved reads --------------------------------------------------------------------------------------------------
 
@@ -119,25 +121,25 @@ qlsvDiagnosticImpl* DtSetContainedDataType(QLTypeSys::DataTypeTable* table, int 
 qlsvDiagnosticImpl* DtSetContainedDataNumDims(QLTypeSys::DataTypeTable* table, int id, unsigned long numDims) { return set(table, id, &DataType::setContainedDataNumDims, numDims); }
 qlsvDiagnosticImpl* DtSetIsPointerType(QLTypeSys::DataTypeTable* table, int id, bool isPointer) { return set(table, id, &DataType::setIsPointerType, isPointer); }
 qlsvDiagnosticImpl* DtSetSerializeFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::SerializeFcn f) { return set(table, id, &DataType::setSerializeFcn, f); }
-qlsvDiagnosticImpl* DtSetSerializeFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setSerializeFcnName, name); }
+qlsvDiagnosticImpl* DtSetSerializeFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setSerializeFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetDeserializeFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::DeserializeFcn f) { return set(table, id, &DataType::setDeserializeFcn, f); }
-qlsvDiagnosticImpl* DtSetDeserializeFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setDeserializeFcnName, name); }
+qlsvDiagnosticImpl* DtSetDeserializeFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setDeserializeFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetSerializeSizeFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::SerializeSizeFcn f) { return set(table, id, &DataType::setSerializeSizeFcn, f); }
-qlsvDiagnosticImpl* DtSetSerializeSizeFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setSerializeSizeFcnName, name); }
+qlsvDiagnosticImpl* DtSetSerializeSizeFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setSerializeSizeFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetSizeOfFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::SizeOfFcn f) { return set(table, id, &DataType::setSizeOfFcn, f); }
-qlsvDiagnosticImpl* DtSetSizeOfFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setSizeOfFcnName, name); }
+qlsvDiagnosticImpl* DtSetSizeOfFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setSizeOfFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetContainedDataFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::ContainedDataFcn f) { return set(table, id, &DataType::setContainedDataFcn, f); }
-qlsvDiagnosticImpl* DtSetContainedDataFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setContainedDataFcnName, name); }
+qlsvDiagnosticImpl* DtSetContainedDataFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setContainedDataFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetContainedDataDimsFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::ContainedDataDimsFcn f) { return set(table, id, &DataType::setContainedDataDimsFcn, f); }
-qlsvDiagnosticImpl* DtSetContainedDataDimsFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setContainedDataDimsFcnName, name); }
+qlsvDiagnosticImpl* DtSetContainedDataDimsFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setContainedDataDimsFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetUpdateContainedDataDimsFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::UpdateContainedDataDimsFcn f) { return set(table, id, &DataType::setUpdateContainedDataDimsFcn, f); }
-qlsvDiagnosticImpl* DtSetUpdateContainedDataDimsFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setUpdateContainedDataDimsFcnName, name); }
+qlsvDiagnosticImpl* DtSetUpdateContainedDataDimsFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setUpdateContainedDataDimsFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetUpdateContainedDataDimFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::UpdateContainedDataDimFcn f) { return set(table, id, &DataType::setUpdateContainedDataDimFcn, f); }
-qlsvDiagnosticImpl* DtSetUpdateContainedDataDimFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setUpdateContainedDataDimFcnName, name); }
+qlsvDiagnosticImpl* DtSetUpdateContainedDataDimFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setUpdateContainedDataDimFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetCoderPropertiesFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::CoderPropertiesFcn f) { return set(table, id, &DataType::setCoderPropertiesFcn, f); }
-qlsvDiagnosticImpl* DtSetCoderPropertiesFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setCoderPropertiesFcnName, name); }
+qlsvDiagnosticImpl* DtSetCoderPropertiesFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setCoderPropertiesFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetDataConstructFcn(QLTypeSys::DataTypeTable* table, int id, QLTypeSys::DataConstructFcn f) { return set(table, id, &DataType::setDataConstructFcn, f); }
-qlsvDiagnosticImpl* DtSetDataConstructFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setDataConstructFcnName, name); }
+qlsvDiagnosticImpl* DtSetDataConstructFcnName(QLTypeSys::DataTypeTable* table, int id, const char* name) { return set(table, id, &DataType::setDataConstructFcnName, textOf(name)); }
 
 // --- Block setters ---------------------------------------------------------------------------------------------------
 
@@ -151,11 +153,11 @@ qlsvDiagnosticImpl* DtSetDataTypePropertiesSize(QLTypeSys::DataTypeTable* table,
 qlsvDiagnosticImpl* DtSetDataTypeGround(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const void* ground) { return set(table, blockName, id, &DataType::setGround, ground); }
 qlsvDiagnosticImpl* DtSetConvertBetweenFcn(QLTypeSys::DataTypeTable* table, const char* blockName, int id, QLTypeSys::ConvertBetweenFcn f) { return set(table, blockName, id, &DataType::setConvertBetweenFcn, f); }
 qlsvDiagnosticImpl* DtSetConstructFcn(QLTypeSys::DataTypeTable* table, const char* blockName, int id, QLTypeSys::ConstructFcn f) { return set(table, blockName, id, &DataType::setConstructFcn, f); }
-qlsvDiagnosticImpl* DtSetConstructFcnName(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const char* name) { return set(table, blockName, id, &DataType::setConstructFcnName, name); }
+qlsvDiagnosticImpl* DtSetConstructFcnName(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const char* name) { return set(table, blockName, id, &DataType::setConstructFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetDestructFcn(QLTypeSys::DataTypeTable* table, const char* blockName, int id, QLTypeSys::DestructFcn f) { return set(table, blockName, id, &DataType::setDestructFcn, f); }
-qlsvDiagnosticImpl* DtSetDestructFcnName(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const char* name) { return set(table, blockName, id, &DataType::setDestructFcnName, name); }
+qlsvDiagnosticImpl* DtSetDestructFcnName(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const char* name) { return set(table, blockName, id, &DataType::setDestructFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetDeepCopyFcn(QLTypeSys::DataTypeTable* table, const char* blockName, int id, QLTypeSys::DeepCopyFcn f) { return set(table, blockName, id, &DataType::setDeepCopyFcn, f); }
-qlsvDiagnosticImpl* DtSetDeepCopyFcnName(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const char* name) { return set(table, blockName, id, &DataType::setDeepCopyFcnName, name); }
+qlsvDiagnosticImpl* DtSetDeepCopyFcnName(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const char* name) { return set(table, blockName, id, &DataType::setDeepCopyFcnName, textOf(name)); }
 qlsvDiagnosticImpl* DtSetDataTypeProperties(QLTypeSys::DataTypeTable* table, const char* blockName, int id, const void* properties) { return set(table, blockName, id, &DataType::setProperties, properties); }
 
 // --- Forwards to the member of the table -----------------------------------------------------------------------------

@@ -29,7 +29,7 @@ class DataTypeTable;
 // clang-format off
 
 // --- Direct reads, and their setter twins: the record at `id`, no alias resolution.
-//     Unchecked: `id` must be valid.
+//     Unchecked: `id` must be valid. A null name is stored as the empty one.
 
 QL_EXPORT int DtGetDataTypeSize(const QLTypeSys::DataTypeTable* table, int id);
 QL_EXPORT int getDataTypeSize(const QLTypeSys::DataTypeTable* table, int id);
@@ -103,7 +103,8 @@ QL_EXPORT bool DtHasContainedDataDimsFcn(const QLTypeSys::DataTypeTable* table, 
 QL_EXPORT bool DtHasDataConstructFcn(const QLTypeSys::DataTypeTable* table, int id);
 QL_EXPORT bool DtHasCoderPropertiesFcn(const QLTypeSys::DataTypeTable* table, int id);
 
-// --- Plain setters: null on success, else the diagnostic of what the setter raised. Unchecked: `id` must be valid.
+// --- Plain setters: null on success, else the diagnostic of what the setter raised. Unchecked: `id` must be valid. A
+//     null name is stored as the empty one.
 
 QL_EXPORT qlsvDiagnosticImpl* DtSetContainedDataType(QLTypeSys::DataTypeTable* table, int id, int containedId);
 QL_EXPORT qlsvDiagnosticImpl* DtSetContainedDataNumDims(QLTypeSys::DataTypeTable* table, int id, unsigned long numDims);

@@ -143,7 +143,7 @@ void DataTypeTable::setDataTypeStorageId(int id, int storageId) {
 // --- Custom types ----------------------------------------------------------------------------------------------------
 
 bool DataTypeTable::hasCustomDataTypeCallback(const char* name) const {
-    return customDataTypeCallbacks_.find(name) != customDataTypeCallbacks_.end();
+    return name && customDataTypeCallbacks_.find(name) != customDataTypeCallbacks_.end();
 }
 
 void DataTypeTable::insertCustomDataTypeCallback(const char* name, CustomDataTypeCallback callback) {

@@ -220,6 +220,23 @@ TEST_F(FlatTest, Forwards) {
                   "Late");
 }
 
+TEST_F(FlatTest, NoNameIsTheEmptyName) {
+    record->setSerializeFcnName("serialize");
+    EXPECT_EQ(DtSetSerializeFcnName(&table, plain, nullptr), nullptr);
+    EXPECT_STREQ(DtGetSerializeFcnName(&table, plain), "");
+    EXPECT_EQ(DtSetConstructFcnName(&table, "block", plain, nullptr), nullptr);
+    EXPECT_STREQ(DtGetConstructFcnName(&table, "caller", plain), "");
+    EXPECT_FALSE(DtHasConstructFcn(&table, plain));
+    expectDiagnostic(DtSetConstructFcnName(&table, "", alias, nullptr),
+                     "QuillaneTypes:general:CannotSetPropertyOfAliasType('ConstructName', 'Second')");
+    DtSetDataTypeShortName(&table, plain, nullptr);
+    EXPECT_STREQ(DtGetDataTypeShortName(&table, plain), "");
+    EXPECT_EQ(DtGetOrRegisterKnownCustomDataTypeId(&table, nullptr), -10);
+    EXPECT_FALSE(IntrinsicFixptName(nullptr));
+    EXPECT_EQ(GetBuiltInDataType(static_cast<const char*>(nullptr)), -10);
+    EXPECT_FALSE(NameOfBuiltInDataType(static_cast<const char*>(nullptr)));
+}
+
 TEST_F(FlatTest, FieldsOfTheTable) {
     _qlDataTypeAccess_tag own{};
     _qlDataTypeAccess_tag* const before = DtGetDataTypeAccess(&table);
