@@ -34,10 +34,12 @@ std::uint8_t classOf(char c) { return identifierClass[static_cast<unsigned char>
 template <class To, class From> std::basic_string<To> converted(std::basic_string_view<From> text) {
     namespace utf = boost::locale::utf;
     constexpr utf::code_point replacement = 0xFFFD;
-    std::basic_string<To> result;
+    const From* const end = text.data() + text.size();
+    // Most texts are ASCII alone, which all encodings have unit for unit.
+    const From* at = std::find_if(text.data(), end, [](From c) { return c < 0 || c > 0x7f; });
+    std::basic_string<To> result(text.data(), at);
+    if (at == end) return result;
     result.reserve(text.size());
-    const From* at = text.data();
-    const From* const end = at + text.size();
     while (at != end) {
         const From* const start = at;
         utf::code_point c = utf::utf_traits<From>::decode(at, end);
