@@ -2,6 +2,7 @@
 // traps.
 #pragma once
 
+#include <cmath>
 #include <limits>
 
 namespace QLTypeSys::structures {
@@ -16,6 +17,12 @@ inline long wrappingSubtract(long a, long b) {
 
 inline long wrappingMultiply(long a, long b) {
     return static_cast<long>(static_cast<unsigned long>(a) * static_cast<unsigned long>(b));
+}
+
+/// How many times `b` goes into `a`, computed in double; the largest value for what is beyond it. `b` is above 0.
+inline long quotientInDouble(long a, long b) {
+    const double quotient = std::floor(static_cast<double>(a) / static_cast<double>(b));
+    return quotient < 0x1p63 ? static_cast<long>(quotient) : std::numeric_limits<long>::max();
 }
 
 /// A dimension or padding as a 32-bit integer: unknown (-1) stays, infinite (the largest value) becomes 0x7ffffffe,

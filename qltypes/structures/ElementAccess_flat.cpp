@@ -18,8 +18,9 @@ FlatElementAccess::FlatElementAccess(const DataTypeTable* table, int id)
 FlatElementAccess::~FlatElementAccess() { delete dfs_; }
 
 long FlatElementAccess::getDFSIdx(long flatIdx) const {
-    dfs_->genFlatIdxToDFSIdxCache();
-    return DtGetStructDataTypeObject_AliasedThruIfNeeded(table_, dataTypeId_)->getDFSIdxFromFlatIdx(flatIdx);
+    const StructDataType* const structure = DtGetStructDataTypeObject_AliasedThruIfNeeded(table_, dataTypeId_);
+    if (structure->isFlatElementCacheEmpty()) dfs_->genFlatIdxToDFSIdxCache();
+    return structure->getDFSIdxFromFlatIdx(flatIdx);
 }
 
 // clang-format off

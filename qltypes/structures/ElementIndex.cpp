@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <atomic>
-#include <cmath>
 
 #include "qltypes/host/Failure_internal.h"
 #include "qltypes/structures/Arithmetic_internal.h"
@@ -18,6 +17,9 @@ namespace {
 std::atomic<unsigned long> numEdits{1};
 
 unsigned long edits() { return numEdits.load(std::memory_order_relaxed); }
+
+// How far in front of a walk its elements are fetched.
+constexpr long stepsAhead = 6;
 
 // Up to here the quotient of two whole doubles reaches the next whole number only where the division does.
 constexpr long exactInDouble = 1L << 53;
@@ -167,9 +169,9 @@ ElementIndex::Place ElementIndex::place(long idx) const {
     const long numNodes = numbering_.numDFS;
     if (idx <= 0 || numNodes <= 0) return at;
     if (idx >= numNodes || numNodes >= exactInDouble) {
-        const double quotient = std::floor(static_cast<double>(idx) / static_cast<double>(numNodes));
+        const long quotient = quotientInDouble(idx, numNodes);
         if (quotient > 0) {
-            at.instance = static_cast<long>(quotient);
+            at.instance = quotient;
             at.base = wrappingMultiply(at.instance, numNodes);
             return at;
         }
@@ -179,6 +181,13 @@ ElementIndex::Place ElementIndex::place(long idx) const {
         if (numbering_.invalidTypeId) raiseInvalidType();
         return at;
     }
+    if (element == lastPlaced_ + 1 && element + stepsAhead < numImmediate()) { // a walk: they lie in memory
+        const auto* const next = reinterpret_cast<const char*>(&immediate(element + stepsAhead));
+        __builtin_prefetch(next);
+        __builtin_prefetch(next + 64);
+        __builtin_prefetch(next + 128);
+    }
+    lastPlaced_ = element;
     const long before = lastNode(element - 1);
     at.element = element;
     at.nested = nestedIn(element);

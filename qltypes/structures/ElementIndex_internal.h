@@ -198,6 +198,7 @@ class ElementIndex {
     StructDataType* record_; // null once the structure let go of this index
     Numbering numbering_;
     SpanSearch nodes_, raw_;           // in the numbering
+    mutable long lastPlaced_ = -1;     // the element that place() found last
     std::vector<long> varDimsOffsets_; // copied as the offsets of the elements are
     unsigned long readAt_ = 0;
 

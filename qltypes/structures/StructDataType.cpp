@@ -1,7 +1,6 @@
 #include "qltypes/structures/StructDataType.h"
 
 #include <algorithm>
-#include <cmath>
 
 #include "qltypes/structures/Arithmetic_internal.h"
 #include "qltypes/structures/ElementIndex_internal.h"
@@ -10,8 +9,10 @@
 
 using QLTypeSys::DataType;
 using QLTypeSys::DataTypeTable;
+using QLTypeSys::structures::quotientInDouble;
 using QLTypeSys::structures::wrappingAdd;
 using QLTypeSys::structures::wrappingMultiply;
+using QLTypeSys::structures::wrappingSubtract;
 
 CachedElement::~CachedElement() {
     if (ownsElement) delete element;
@@ -52,6 +53,11 @@ void StructDataType::setNumElements(long count) {
     elements_.resize(static_cast<std::size_t>(count));
     for (StructElement*& slot : elements_)
         slot = new StructElement; // kept: over whatever was there
+    noteEdit();
+}
+
+void StructDataType::setSize(int size) {
+    DataType::setSize(size);
     noteEdit();
 }
 
@@ -146,32 +152,50 @@ FrequentlyAccessedProperties StructDataType::createCacheForFrequentlyAccessedPro
 
 // --- Flat and depth-first indices ------------------------------------------------------------------------------------
 
+// An entry of the vector. In a run, which a structure of leaves alone has, it is not read: that would be memory.
+long StructDataType::leafNode(long flatIdx) const {
+    return dfsIdxFromFlatIdxIsRun_ ? wrappingAdd(dfsIdxFromFlatIdx_.front(), flatIdx)
+                                   : dfsIdxFromFlatIdx_[static_cast<std::size_t>(flatIdx)];
+}
+
+// Position of the first entry that is `node`; the size of the vector when there is none.
+std::size_t StructDataType::leafAt(long node) const {
+    const std::size_t numKnown = dfsIdxFromFlatIdx_.size();
+    const auto begin = dfsIdxFromFlatIdx_.begin();
+    const auto end = dfsIdxFromFlatIdx_.end();
+    if (numKnown == 0) return 0;
+    if (dfsIdxFromFlatIdxIsRun_)
+        return std::min(numKnown, static_cast<std::size_t>(wrappingSubtract(node, dfsIdxFromFlatIdx_.front())));
+    auto found = dfsIdxFromFlatIdxIsSorted_ ? std::lower_bound(begin, end, node) : std::find(begin, end, node);
+    if (found != end && *found != node) found = end;
+    return static_cast<std::size_t>(found - begin);
+}
+
 long StructDataType::getDFSIdxFromFlatIdx(long flatIdx) const {
+    if (flatIdx < 0) return -1;
     const auto numKnown = static_cast<long>(dfsIdxFromFlatIdx_.size());
-    if (flatIdx < numKnown) return dfsIdxFromFlatIdx_[static_cast<std::size_t>(flatIdx)];
+    if (flatIdx < numKnown) return leafNode(flatIdx);
     const long within = numFlatElements_ > 0 ? flatIdx % numFlatElements_ : numKnown;
     if (within >= numKnown) return -1; // counted, but no leaf: of a nested structure that is said to be complex
-    const double quotient = std::floor(static_cast<double>(flatIdx) / static_cast<double>(numFlatElements_));
-    return wrappingAdd(wrappingMultiply(static_cast<long>(quotient), numDFSElements_),
-                       dfsIdxFromFlatIdx_[static_cast<std::size_t>(within)]);
+    return wrappingAdd(wrappingMultiply(quotientInDouble(flatIdx, numFlatElements_), numDFSElements_),
+                       leafNode(within));
 }
 
 long StructDataType::getFlatIdxFromDFSIdx(const long& dfsIdx) const {
     if (numDFSElements_ <= 0) return -1;
     const bool isFurther = dfsIdx >= numDFSElements_;
     const long instance = isFurther ? dfsIdx / numDFSElements_ : 0;
-    const long within = isFurther ? dfsIdx % numDFSElements_ : dfsIdx;
-    const auto begin = dfsIdxFromFlatIdx_.begin();
-    const auto end = dfsIdxFromFlatIdx_.end();
-    auto found = dfsIdxFromFlatIdxIsSorted_ ? std::lower_bound(begin, end, within) : std::find(begin, end, within);
-    if (found != end && *found != within) found = end;
-    const long position = found - begin;
+    const auto position = static_cast<long>(leafAt(isFurther ? dfsIdx % numDFSElements_ : dfsIdx));
     return position == numFlatElements_ ? -1 : wrappingAdd(wrappingMultiply(instance, numFlatElements_), position);
 }
 
 void StructDataType::setDFSIdxFromFlatIdx(const std::vector<long>& dfsIdxFromFlatIdx) {
     dfsIdxFromFlatIdx_ = dfsIdxFromFlatIdx;
-    dfsIdxFromFlatIdxIsSorted_ = std::is_sorted(dfsIdxFromFlatIdx_.begin(), dfsIdxFromFlatIdx_.end());
+    const auto begin = dfsIdxFromFlatIdx_.begin();
+    const auto end = dfsIdxFromFlatIdx_.end();
+    const auto isNoStep = [](long a, long b) { return wrappingAdd(a, 1) != b; };
+    dfsIdxFromFlatIdxIsRun_ = std::adjacent_find(begin, end, isNoStep) == end;
+    dfsIdxFromFlatIdxIsSorted_ = std::is_sorted(begin, end);
 }
 
 // --- What views answered ---------------------------------------------------------------------------------------------

@@ -86,7 +86,7 @@ class QL_EXPORT StructDataType : public QLTypeSys::DataType {
     /// The immediate elements. Owned by the record.
     virtual const std::vector<StructElement*>& getElements() const;
     /// The depth-first index of a leaf, from the vector that setDFSIdxFromFlatIdx set. An index past the end lies in a
-    /// further instance of the structure. -1 where the vector has no entry. Unchecked: `flatIdx` must not be negative.
+    /// further instance of the structure. -1 where the vector has no entry, as for a negative index.
     virtual long getDFSIdxFromFlatIdx(long flatIdx) const;
     /// The flat index of a node; -1 for a node that is no leaf.
     virtual long getFlatIdxFromDFSIdx(const long& dfsIdx) const;
@@ -98,6 +98,8 @@ class QL_EXPORT StructDataType : public QLTypeSys::DataType {
     /// Whether the structure is a bus of the engine.
     virtual bool isBusType() const;
 
+    /// As of every type. Views count instances by the size that stands.
+    void setSize(int size) override;
     /// The type ids of the elements, in their order and with duplicates.
     std::vector<int> dependsOn() const override;
     // Work on the leaves of a value is the client's: these do nothing.
@@ -151,7 +153,11 @@ class QL_EXPORT StructDataType : public QLTypeSys::DataType {
     FrequentlyAccessedProperties derive(const QLTypeSys::DataTypeTable* table);
     void noteEdit() const;
 
+    long leafNode(long flatIdx) const;
+    std::size_t leafAt(long node) const;
+
     bool dfsIdxFromFlatIdxIsSorted_ = true;
+    bool dfsIdxFromFlatIdxIsRun_ = true; // each entry is one more than the entry in front of it
     std::unique_ptr<QLTypeSys::structures::ElementIndexes> indexes_; // made by views, dropped by clearDFSCache
 };
 

@@ -44,8 +44,9 @@ DFSElementAccess dfs(const DataTypeTable* table, int id) { return DFSElementAcce
 
 // The flat view without making one, which allocates: its answers are those of the depth-first view at this index.
 long dfsIdx(const DataTypeTable* table, int id, long flatIdx) {
-    dfs(table, id).genFlatIdxToDFSIdxCache();
-    return DtGetStructDataTypeObject_AliasedThruIfNeeded(table, id)->getDFSIdxFromFlatIdx(flatIdx);
+    const StructDataType* const structure = DtGetStructDataTypeObject_AliasedThruIfNeeded(table, id);
+    if (structure->isFlatElementCacheEmpty()) dfs(table, id).genFlatIdxToDFSIdxCache();
+    return structure->getDFSIdxFromFlatIdx(flatIdx);
 }
 
 std::string pathText(const DataTypeTable* table, int id, long dfsIdx) {

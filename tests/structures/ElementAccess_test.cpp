@@ -272,6 +272,38 @@ TEST(Freezing, ChangedCountsAndDimensionsAreSeen) {
     EXPECT_STREQ(dfs.getName(9), "y");
 }
 
+TEST(Freezing, ASizeThatIsSetLateCounts) {
+    Structures s;
+    const int inner = s.define("In", {{"a", real}});
+    const int id = s.define("S", {{"n", inner, {3}}});
+    for (const int each : {inner, id}) {
+        s.element(each, 0)->setOffset(0);
+        s.record(each)->setNumDFSElements(each == inner ? 2 : 8);
+    }
+    const DFSElementAccess dfs(&s.table, id);
+    EXPECT_EQ(dfs.getOffset(6), -2) << "two instances of size -1";
+    EXPECT_EQ(dfs.getOffset(8), -1) << "which is no answer to keep";
+    s.record(inner)->setSize(8);
+    s.record(id)->setSize(24);
+    EXPECT_EQ(dfs.getOffset(4), 8);
+    EXPECT_EQ(dfs.getOffset(6), -2) << "as it was answered";
+    EXPECT_EQ(dfs.getOffset(8), 24);
+    EXPECT_EQ(dfs.getOffset(16), 48);
+}
+
+TEST(Freezing, AnIdentifierThatIsHandedOutAgainIsAnotherType) {
+    Structures s;
+    const int id = s.define("S", {{"a", -10}, {"b", real}});
+    s.record(id)->setNumDFSElements(5);
+    const int leaf = s.plain("P", 8);
+    s.element(id, 0)->setDataTypeId(leaf);
+    const DFSElementAccess dfs(&s.table, id);
+    EXPECT_EQ(dfs.getFullPathAsString(2, false), u"b");
+    s.table.removeDataType(s.table.getDataTypeAliasedThruTo(leaf));
+    ASSERT_EQ(s.laidOut("In", {{"x", real}, {"y", real}}), leaf);
+    EXPECT_EQ(dfs.getFullPathAsString(2, false), u"a.x");
+}
+
 // --- Memory ----------------------------------------------------------------------------------------------------------
 
 #ifndef __SANITIZE_ADDRESS__

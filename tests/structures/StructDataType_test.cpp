@@ -294,8 +294,10 @@ TEST(StructDataType, FlatAndDepthFirstIndices) {
 TEST(StructDataType, TheVectorOfAClientCounts) {
     Example e;
     StructDataType* const record = e.record(e.outer);
-    for (const std::vector<long>& set :
-         {std::vector<long>{11, 10, 8, 7, 5, 4, 1}, {1, 1, 4, 4, 7, 7, 7}, {2, 4, 6, 8, 9, 10, 11}}) {
+    for (const std::vector<long>& set : {std::vector<long>{11, 10, 8, 7, 5, 4, 1},
+                                         {1, 1, 4, 4, 7, 7, 7},
+                                         {2, 4, 6, 8, 9, 10, 11},
+                                         {4, 5, 6, 7, 8, 9, 10}}) {
         record->setDFSIdxFromFlatIdx(set);
         EXPECT_FALSE(record->isFlatElementCacheEmpty());
         const FlatElementAccess flat(&e.table, e.outer);
@@ -322,6 +324,28 @@ TEST(StructDataType, NoIndexWithoutALayout) {
     const StructDataType* const record = s.record(s.define("S", {{"a", real}}));
     EXPECT_EQ(record->getDFSIdxFromFlatIdx(0), -1);
     EXPECT_EQ(record->getFlatIdxFromDFSIdx(0), -1);
+}
+
+TEST(StructDataType, IndicesBeyondAllBounds) {
+    constexpr long largest = std::numeric_limits<long>::max();
+    Structures s;
+    const int id = s.laidOut("S", {{"a", real}});
+    const FlatElementAccess flat(&s.table, id);
+    EXPECT_EQ(flat.getDFSIdx(0), 1);
+    EXPECT_EQ(flat.getDFSIdx(largest), -1) << "largest times two, and one";
+    for (const long below : {-1L, -2L, -largest - 1}) {
+        EXPECT_EQ(flat.getDFSIdx(below), -1);
+        EXPECT_EQ(flat.getOffset(below), 0) << "as the root";
+    }
+    const int nothing = s.define("Nothing", {{"n", s.define("Empty", {}), {0}}});
+    s.record(nothing)->setNumDFSElements(1);
+    long immediate, instance, base;
+    int type;
+    DFSElementAccess(&s.table, nothing).computeDataTypeIdAndIndex(largest, &immediate, &instance, &type, &base);
+    EXPECT_EQ(immediate, -1);
+    EXPECT_EQ(instance, largest);
+    EXPECT_EQ(base, largest);
+    EXPECT_EQ(type, nothing);
 }
 
 // --- Cached answers --------------------------------------------------------------------------------------------------
