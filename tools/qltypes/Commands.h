@@ -4,7 +4,7 @@
 #include <stdexcept>
 #include <string>
 
-#include <CLI/CLI.hpp>
+#include "CommandLine.h"
 
 namespace inspector {
 
@@ -17,13 +17,13 @@ class UsageError : public std::runtime_error {
 /// Ends a command with 1 once it has said all: a loss or a difference was found.
 struct DifferenceFound {};
 
-void addLayoutCommand(CLI::App& app);
-void addTypeCommand(CLI::App& app);
-void addConvertCommand(CLI::App& app);
-void addDimsCommand(CLI::App& app);
-void addTimeCommand(CLI::App& app);
-void addTableCommand(CLI::App& app);
-void addMessagesCommand(CLI::App& app);
-void addFlagsCommand(CLI::App& app);
+void addLayoutCommand(CommandLine& line);
+void addTypeCommand(CommandLine& line);
+void addConvertCommand(CommandLine& line);
+void addDimsCommand(CommandLine& line);
+void addTimeCommand(CommandLine& line);
+void addTableCommand(CommandLine& line);
+void addMessagesCommand(CommandLine& line);
+void addFlagsCommand(CommandLine& line);
 
 } // namespace inspector

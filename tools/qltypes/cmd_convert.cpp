@@ -174,25 +174,22 @@ void convert(const Options& options, const ConversionMode& mode, LossCounter& co
 
 } // namespace
 
-void addConvertCommand(CLI::App& app) {
+void addConvertCommand(CommandLine& line) {
     const auto options = std::make_shared<Options>();
-    CLI::App* const command =
-        app.add_subcommand("convert", "Converts values among the built-in types and tells what is lost");
-    command->add_option("--from", options->from, "Type of the values: double, single, int8 ... uint32, boolean")
-        ->required();
-    command->add_option("--to", options->to, "Type of the results")->required();
-    command->add_option("--rounding", options->rounding,
-                        "zero (default), half-up, ceiling, floor, as-zero, half-away or half-even");
-    command->add_option("--overflow", options->overflow, "saturate (default) or wrap");
-    command->add_option("VALUE", options->values,
-                        "Values; without any, or with - alone, they are read from standard input. Put -- in front of"
-                        " them where one is negative");
-    command->add_flag("--raw", options->isRaw,
-                      "Little-endian binary from standard input to standard output, of any length");
-    command->add_flag("--predict", options->isPrediction, "Only tell which values would overflow");
-    command->add_flag("--json", options->asJson,
-                      "Print JSON with stable keys; with --raw the report goes to standard error");
-    command->footer(
+    Subcommand command = line.subcommand("convert", "Converts values among the built-in types and tells what is lost");
+    command.option("--from", options->from, "Type of the values: double, single, int8 ... uint32, boolean").required();
+    command.option("--to", options->to, "Type of the results").required();
+    command.option("--rounding", options->rounding,
+                   "zero (default), half-up, ceiling, floor, as-zero, half-away or half-even");
+    command.option("--overflow", options->overflow, "saturate (default) or wrap");
+    command.option("VALUE", options->values,
+                   "Values; without any, or with - alone, they are read from standard input. Put -- in front of"
+                   " them where one is negative");
+    command.flag("--raw", options->isRaw, "Little-endian binary from standard input to standard output, of any length");
+    command.flag("--predict", options->isPrediction, "Only tell which values would overflow");
+    command.flag("--json", options->asJson,
+                 "Print JSON with stable keys; with --raw the report goes to standard error");
+    command.footer(
         "Results go to standard output, losses with the first positions (from 0) to standard error. Ends with 1 when\n"
         "something was lost: by overflow, by precision, or because the value was no number.\n"
         "Examples:\n"
@@ -200,7 +197,7 @@ void addConvertCommand(CLI::App& app) {
         "  seq 1000 | qltypes convert --from int32 --to uint8 --overflow wrap\n"
         "  qltypes convert --raw --from double --to single <doubles.bin >singles.bin\n"
         "  qltypes convert --predict --from double --to int16 40000 3");
-    command->callback([options] {
+    command.run([options] {
         const ConversionMode mode = modeOf(*options);
         const auto source = sourceOf(*options, mode.fromId);
         LossCounter counter(mode);

@@ -102,16 +102,16 @@ void converse() {
 
 } // namespace
 
-void addDimsCommand(CLI::App& app) {
+void addDimsCommand(CommandLine& line) {
     const auto options = std::make_shared<Options>();
-    CLI::App* const command =
-        app.add_subcommand("dims", "Runs a script that states facts of symbolic dimensions and asks what follows");
-    command->add_option("SCRIPT", options->script,
-                        "File of statements; - or nothing is standard input, with a prompt on a terminal");
-    command->add_option("--format", options->format, "text, json, or dot: the facts at the end as a graph for Graphviz")
-        ->check(CLI::IsMember({"text", "json", "dot"}));
-    command->add_flag("--json", options->asJson, "Print JSON with stable keys");
-    command->footer(
+    Subcommand command =
+        line.subcommand("dims", "Runs a script that states facts of symbolic dimensions and asks what follows");
+    command.option("SCRIPT", options->script,
+                   "File of statements; - or nothing is standard input, with a prompt on a terminal");
+    command.option("--format", options->format, "text, json, or dot: the facts at the end as a graph for Graphviz")
+        .oneOf({"text", "json", "dot"});
+    command.flag("--json", options->asJson, "Print JSON with stable keys");
+    command.footer(
         "Statements, a line each, # begins a comment; A and B are expressions or lists of dimensions:\n" +
         statementHelp() +
         "Facts are stated and asked of simplified expressions. What contradicts them is refused: the message\n"
@@ -120,7 +120,7 @@ void addDimsCommand(CLI::App& app) {
         "  qltypes dims examples/filter_bank.dims\n"
         "  echo 'simplify (K*L + 2*K)/K' | qltypes dims\n"
         "  qltypes dims examples/filter_bank.dims --format dot | dot -Tsvg > facts.svg");
-    command->callback([options] {
+    command.run([options] {
         if (options->asJson) options->format = "json";
         const bool isStandardInput = options->script == "-";
         if (isStandardInput && options->format == "text" && isatty(STDIN_FILENO) == 1) return converse();

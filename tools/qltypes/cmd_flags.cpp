@@ -51,14 +51,14 @@ std::string flagsJson() {
 
 } // namespace
 
-void addFlagsCommand(CLI::App& app) {
+void addFlagsCommand(CommandLine& line) {
     const auto asJson = std::make_shared<bool>(false);
-    CLI::App* const command = app.add_subcommand("flags", "Lists feature flags and testing hooks with their states");
-    command->add_flag("--json", *asJson, "Print JSON with stable keys");
-    command->footer("Examples:\n"
-                    "  qltypes flags\n"
-                    "  qltypes flags --json | jq '.features[] | select(.state != 0).name'");
-    command->callback([asJson] { print(*asJson ? flagsJson() : flagsText(coloursOfOutput())); });
+    Subcommand command = line.subcommand("flags", "Lists feature flags and testing hooks with their states");
+    command.flag("--json", *asJson, "Print JSON with stable keys");
+    command.footer("Examples:\n"
+                   "  qltypes flags\n"
+                   "  qltypes flags --json | jq '.features[] | select(.state != 0).name'");
+    command.run([asJson] { print(*asJson ? flagsJson() : flagsText(coloursOfOutput())); });
 }
 
 } // namespace inspector

@@ -135,7 +135,7 @@ std::string titleOf(const std::vector<std::string>& inputs) {
 
 } // namespace
 
-void addLayoutCommand(CLI::App& app) {
+void addLayoutCommand(CommandLine& line) {
     struct Options {
         std::vector<std::string> inputs;
         std::vector<std::string> only;
@@ -147,40 +147,37 @@ void addLayoutCommand(CLI::App& app) {
         bool asJson = false;
     };
     const auto options = std::make_shared<Options>();
-    CLI::App* const command =
-        app.add_subcommand("layout", "Lays structures out and shows where each element lies, and why");
+    Subcommand command = line.subcommand("layout", "Lays structures out and shows where each element lies, and why");
     command
-        ->add_option(
-            "INPUT", options->inputs,
-            "JSON type descriptions (- is standard input), .msg files, folders of .msg files, and .dims scripts of "
-            "what is known of symbolic dimensions")
-        ->required();
-    command->add_option("--only", options->only, "Show only these structures, names divided by commas")->delimiter(',');
-    CLI::Option* const numberings =
-        command->add_flag("--numberings", options->withNumberings,
-                          "Number each node too: depth-first, flat, raw and immediate, with its full path");
-    CLI::Option* const checksum = command->add_flag(
-        "--checksum", options->withChecksum, "Show the text by which each element enters the checksum, and the digest");
-    CLI::Option* const node =
+        .option("INPUT", options->inputs,
+                "JSON type descriptions (- is standard input), .msg files, folders of .msg files, and .dims scripts of "
+                "what is known of symbolic dimensions")
+        .required();
+    command.option("--only", options->only, "Show only these structures, names divided by commas").delimiter(',');
+    const Option numberings =
+        command.flag("--numberings", options->withNumberings,
+                     "Number each node too: depth-first, flat, raw and immediate, with its full path");
+    const Option checksum = command.flag("--checksum", options->withChecksum,
+                                         "Show the text by which each element enters the checksum, and the digest");
+    const Option node =
         command
-            ->add_option("--node", options->node,
-                         "Show one node of the one structure: its depth-first number, or its full path such as y(1).b")
-            ->excludes(numberings)
-            ->excludes(checksum);
-    CLI::Option* const json = command->add_flag("--json", options->asJson, "Print JSON with stable keys");
-    CLI::Option* const format =
+            .option("--node", options->node,
+                    "Show one node of the one structure: its depth-first number, or its full path such as y(1).b")
+            .excludes(numberings)
+            .excludes(checksum);
+    const Option json = command.flag("--json", options->asJson, "Print JSON with stable keys");
+    const Option format =
         command
-            ->add_option("--format", options->format,
-                         "c: print a C header that asserts every size and offset; svg: draw the bytes as a map; html: "
-                         "write a page with tree, byte maps, numberings and types")
-            ->check(CLI::IsMember({"c", "svg", "html"}))
-            ->excludes(json)
-            ->excludes(node)
-            ->excludes(numberings)
-            ->excludes(checksum);
-    command->add_flag("--padding", options->withPadding, "Declare padding as members of the C structures")
-        ->needs(format);
-    command->footer(
+            .option("--format", options->format,
+                    "c: print a C header that asserts every size and offset; svg: draw the bytes as a map; html: "
+                    "write a page with tree, byte maps, numberings and types")
+            .oneOf({"c", "svg", "html"})
+            .excludes(json)
+            .excludes(node)
+            .excludes(numberings)
+            .excludes(checksum);
+    command.flag("--padding", options->withPadding, "Declare padding as members of the C structures").needs(format);
+    command.footer(
         "Examples:\n"
         "  qltypes layout types.json\n"
         "  qltypes layout --json types.json | jq '.structures[].size'\n"
@@ -191,7 +188,7 @@ void addLayoutCommand(CLI::App& app) {
         "  qltypes layout /usr/share/geometry_msgs/msg --only geometry_msgs/Pose\n"
         "  echo '{\"types\": [{\"name\": \"P\", \"elements\": [{\"name\": \"x\", \"type\": \"double\"}]}]}' |"
         " qltypes layout -");
-    command->callback([options] {
+    command.run([options] {
         const auto [description, knownFacts] = readInputs(options->inputs);
         QLTypeSys::DataTypeTable table;
         TypeLoader loader(table);

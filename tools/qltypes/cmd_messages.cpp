@@ -59,20 +59,20 @@ std::string messagesJson(const std::vector<QLTypeSys::CatalogueRow>& rows) {
 
 } // namespace
 
-void addMessagesCommand(CLI::App& app) {
+void addMessagesCommand(CommandLine& line) {
     struct Options {
         std::string filter;
         bool asJson = false;
     };
     const auto options = std::make_shared<Options>();
-    CLI::App* const command = app.add_subcommand("messages", "Lists the messages that the library can raise");
-    command->add_option("FILTER", options->filter, "Only messages with this in category:leaf or text, in either case");
-    command->add_flag("--json", options->asJson, "Print JSON with stable keys");
-    command->footer("Examples:\n"
-                    "  qltypes messages\n"
-                    "  qltypes messages DateTime\n"
-                    "  qltypes messages --json | jq -r '.messages[].leaf'");
-    command->callback([options] {
+    Subcommand command = line.subcommand("messages", "Lists the messages that the library can raise");
+    command.option("FILTER", options->filter, "Only messages with this in category:leaf or text, in either case");
+    command.flag("--json", options->asJson, "Print JSON with stable keys");
+    command.footer("Examples:\n"
+                   "  qltypes messages\n"
+                   "  qltypes messages DateTime\n"
+                   "  qltypes messages --json | jq -r '.messages[].leaf'");
+    command.run([options] {
         const auto rows = selected(options->filter);
         print(options->asJson ? messagesJson(rows) : messagesText(rows, coloursOfOutput()));
     });

@@ -44,15 +44,15 @@ std::string tableJson() {
 
 } // namespace
 
-void addTableCommand(CLI::App& app) {
+void addTableCommand(CommandLine& line) {
     const auto asJson = std::make_shared<bool>(false);
-    CLI::App* const command = app.add_subcommand("table", "Lists the fixed types that every table begins with");
-    command->add_flag("--json", *asJson, "Print JSON with stable keys");
-    command->footer("Sizes are in bytes.\n"
-                    "Examples:\n"
-                    "  qltypes table\n"
-                    "  qltypes table --json | jq '.types[] | select(.kind == \"predefined\")'");
-    command->callback([asJson] { print(*asJson ? tableJson() : tableText(coloursOfOutput())); });
+    Subcommand command = line.subcommand("table", "Lists the fixed types that every table begins with");
+    command.flag("--json", *asJson, "Print JSON with stable keys");
+    command.footer("Sizes are in bytes.\n"
+                   "Examples:\n"
+                   "  qltypes table\n"
+                   "  qltypes table --json | jq '.types[] | select(.kind == \"predefined\")'");
+    command.run([asJson] { print(*asJson ? tableJson() : tableText(coloursOfOutput())); });
 }
 
 } // namespace inspector

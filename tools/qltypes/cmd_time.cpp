@@ -164,23 +164,23 @@ std::string timeJson(const std::vector<DateTimeType>& types, const std::vector<Q
 
 } // namespace
 
-void addTimeCommand(CLI::App& app) {
+void addTimeCommand(CommandLine& line) {
     const auto options = std::make_shared<Options>();
-    CLI::App* const command = app.add_subcommand("time", "Shows scales of time, and checks epochs, ranges and offsets");
-    command->add_option("--scale", options->scale, "Only this scale: tai, gps, utc, posix, jd or mjd");
-    command->add_option("--epoch", options->epoch, "Epoch in place of the default one");
-    command->add_option("--range", options->range, "First and last moment in place of the default ones")->expected(2);
-    command->add_option("--storage", options->storage, "Number type in place of the default one, in either text form");
-    command->add_option("--zone", options->zone,
-                        "Offset of a time zone: whole hours from -12 to 14, with 00, 30 or 45 minutes");
-    command->add_flag("--json", options->asJson, "Print JSON with stable keys");
-    command->footer("Times are written year-month-day, then T and hour:minute:second where wanted.\n"
-                    "Examples:\n"
-                    "  qltypes time\n"
-                    "  qltypes time --scale gps --epoch 2000-01-01T12:00:00 --storage double\n"
-                    "  qltypes time --scale utc --range 1990-01-01 2030-12-31T23:59:60\n"
-                    "  qltypes time --zone +05:45");
-    command->callback([options] {
+    Subcommand command = line.subcommand("time", "Shows scales of time, and checks epochs, ranges and offsets");
+    command.option("--scale", options->scale, "Only this scale: tai, gps, utc, posix, jd or mjd");
+    command.option("--epoch", options->epoch, "Epoch in place of the default one");
+    command.option("--range", options->range, "First and last moment in place of the default ones").numValues(2);
+    command.option("--storage", options->storage, "Number type in place of the default one, in either text form");
+    command.option("--zone", options->zone,
+                   "Offset of a time zone: whole hours from -12 to 14, with 00, 30 or 45 minutes");
+    command.flag("--json", options->asJson, "Print JSON with stable keys");
+    command.footer("Times are written year-month-day, then T and hour:minute:second where wanted.\n"
+                   "Examples:\n"
+                   "  qltypes time\n"
+                   "  qltypes time --scale gps --epoch 2000-01-01T12:00:00 --storage double\n"
+                   "  qltypes time --scale utc --range 1990-01-01 2030-12-31T23:59:60\n"
+                   "  qltypes time --zone +05:45");
+    command.run([options] {
         const auto types = typesOf(*options);
         const auto zones = zonesOf(*options);
         print(options->asJson ? timeJson(types, zones) : timeText(types, zones, coloursOfOutput()));

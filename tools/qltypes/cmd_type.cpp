@@ -127,27 +127,26 @@ std::string typeText(const ReadType& type, const Colours& colours) {
 
 } // namespace
 
-void addTypeCommand(CLI::App& app) {
+void addTypeCommand(CommandLine& line) {
     struct Options {
         std::vector<std::string> texts;
         bool asJson = false;
     };
     const auto options = std::make_shared<Options>();
-    CLI::App* const command =
-        app.add_subcommand("type", "Reads number types and shows record, range, resolution and both text forms");
+    Subcommand command =
+        line.subcommand("type", "Reads number types and shows record, range, resolution and both text forms");
     command
-        ->add_option(
-            "TEXT", options->texts,
-            "Identifiers (sfix16_En7) or constructor texts (fixdt(1,16,7)); - reads a text a line from standard"
-            " input")
-        ->required();
-    command->add_flag("--json", options->asJson, "Print JSON with stable keys");
-    command->footer("Values are given exactly up to 40 digits; in JSON they are texts.\n"
-                    "Examples:\n"
-                    "  qltypes type sfix16_En7\n"
-                    "  qltypes type 'fixdt(0,8,1.5,2)' half\n"
-                    "  echo uint64 | qltypes type --json - | jq '.types[].max'");
-    command->callback([options] {
+        .option("TEXT", options->texts,
+                "Identifiers (sfix16_En7) or constructor texts (fixdt(1,16,7)); - reads a text a line from standard"
+                " input")
+        .required();
+    command.flag("--json", options->asJson, "Print JSON with stable keys");
+    command.footer("Values are given exactly up to 40 digits; in JSON they are texts.\n"
+                   "Examples:\n"
+                   "  qltypes type sfix16_En7\n"
+                   "  qltypes type 'fixdt(0,8,1.5,2)' half\n"
+                   "  echo uint64 | qltypes type --json - | jq '.types[].max'");
+    command.run([options] {
         std::string text;
         nlohmann::ordered_json types = nlohmann::ordered_json::array();
         for (const NumberText& from : textsOf(options->texts)) {

@@ -22,22 +22,19 @@ int complain(const char* text) {
 } // namespace
 
 int main(int argc, char** argv) {
-    CLI::App app("Shows what is in a table of data types, and why it is there.", "qltypes");
-    app.set_version_flag("--version", std::string("qltypes ") + QLTypeSys::libraryVersion());
-    app.require_subcommand(1);
-    app.footer("Help on a subcommand: qltypes SUBCOMMAND --help");
-    inspector::addLayoutCommand(app);
-    inspector::addTypeCommand(app);
-    inspector::addConvertCommand(app);
-    inspector::addDimsCommand(app);
-    inspector::addTimeCommand(app);
-    inspector::addTableCommand(app);
-    inspector::addMessagesCommand(app);
-    inspector::addFlagsCommand(app);
+    inspector::CommandLine line("qltypes", QLTypeSys::libraryVersion(),
+                                "Shows what is in a table of data types, and why it is there.",
+                                "Help on a subcommand: qltypes SUBCOMMAND --help");
+    inspector::addLayoutCommand(line);
+    inspector::addTypeCommand(line);
+    inspector::addConvertCommand(line);
+    inspector::addDimsCommand(line);
+    inspector::addTimeCommand(line);
+    inspector::addTableCommand(line);
+    inspector::addMessagesCommand(line);
+    inspector::addFlagsCommand(line);
     try {
-        app.parse(argc, argv);
-    } catch (const CLI::ParseError& e) {
-        return app.exit(e) == 0 ? 0 : badInput; // help and version are no failures
+        return line.run(argc, argv) ? 0 : badInput;
     } catch (const inspector::DifferenceFound&) {
         return differenceFound;
     } catch (const std::bad_alloc&) {
@@ -47,5 +44,4 @@ int main(int argc, char** argv) {
     } catch (const std::exception& e) {
         return complain(e.what());
     }
-    return 0;
 }

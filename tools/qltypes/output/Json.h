@@ -8,8 +8,6 @@
 namespace inspector {
 
 /// The document, indented by two, with a line end. Bytes that are no UTF-8 become replacement characters.
-inline std::string jsonText(const nlohmann::ordered_json& document) {
-    return document.dump(2, ' ', false, nlohmann::ordered_json::error_handler_t::replace) + "\n";
-}
+std::string jsonText(const nlohmann::ordered_json& document);
 
 } // namespace inspector
