@@ -87,21 +87,16 @@ NodeId ExprWriter::writeTerm(const Integer& coefficient, std::span<const Factor>
                                      [&](const Factor& f) { return !isAtomByItself(store_.op(f.atom)); });
     NodeId product = coefficient.isOne() || (coefficient.isMinusOne() && !hasSums) ? noNode : write(coefficient);
     bool isNegated = coefficient.isMinusOne() && !hasSums;
-    // A product with a sum that was not multiplied out is marked as simplified, for that is how it is read again.
-    const auto marked = [&](NodeId node) {
-        if (hasSums && store_.simplified(node) == noNode) store_.setSimplified(node, node);
-        return node;
-    };
     const auto multiply = [&](NodeId factor) {
         if (isNegated) factor = store_.unary(SymbolicOp::UnaryMinus, factor);
         isNegated = false;
-        product = product == noNode ? factor : marked(store_.binary(SymbolicOp::Multiply, product, factor));
+        product = product == noNode ? factor : store_.binary(SymbolicOp::Multiply, product, factor);
     };
     const auto multiplyAll = [&](bool doubles) {
         for (const Factor& f : factors) {
             if ((store_.op(f.atom) == SymbolicOp::DoubleValue) != doubles) continue;
             if (f.exponent > maxRepeatedFactor)
-                multiply(marked(writePower(f.atom, f.exponent)));
+                multiply(writePower(f.atom, f.exponent));
             else
                 for (std::uint64_t i = 0; i < f.exponent; ++i)
                     multiply(f.atom);

@@ -65,10 +65,14 @@ Polynomial::Polynomial(Integer coefficient, std::span<const Factor> factors) {
 }
 
 void Polynomial::append(Integer coefficient, std::span<const Factor> factors) {
+    pushBack(std::move(coefficient), factors, degreeOf(factors));
+    ++numOrdered_;
+}
+
+void Polynomial::pushBack(Integer coefficient, std::span<const Factor> factors, std::uint64_t degree) {
     const auto first = static_cast<std::uint32_t>(factors_.size());
     factors_.insert(factors_.end(), factors.begin(), factors.end());
-    terms_.push_back({std::move(coefficient), first, static_cast<std::uint32_t>(factors.size()), degreeOf(factors)});
-    ++numOrdered_;
+    terms_.push_back({std::move(coefficient), first, static_cast<std::uint32_t>(factors.size()), degree});
 }
 
 bool Polynomial::precedes(const Term& a, const Term& b) const {
@@ -101,30 +105,38 @@ void Polynomial::divideExactly(const Integer& divisor) {
 
 void Polynomial::add(const Polynomial& other, bool negated) {
     const bool changesSign = negated != (other.isNegated_ != isNegated_);
-    for (const Term& t : other.terms_) {
-        const auto added = other.factors(t);
-        Integer coefficient = changesSign ? -t.coefficient : t.coefficient;
-        if (numOrdered_ == terms_.size()) { // everything so far is in order: perhaps this one is, too
-            const int order =
-                terms_.empty() ? -1 : compareMonomials(terms_.back().degree, factors(terms_.back()), t.degree, added);
-            if (order < 0) {
-                append(std::move(coefficient), added);
-                continue;
+    for (const Term& t : other.terms_)
+        gather(changesSign ? -t.coefficient : t.coefficient, other.factors(t), t.degree);
+    normalizeWhatWaits();
+}
+
+void Polynomial::add(Integer coefficient, std::span<const Factor> factors) {
+    if (isNegated_) coefficient.negate();
+    gather(std::move(coefficient), factors, degreeOf(factors));
+    normalizeWhatWaits();
+}
+
+void Polynomial::gather(Integer coefficient, std::span<const Factor> added, std::uint64_t degree) {
+    if (numOrdered_ == terms_.size()) { // everything so far is in order: perhaps this one is, too
+        const int order =
+            terms_.empty() ? -1 : compareMonomials(terms_.back().degree, factors(terms_.back()), degree, added);
+        if (order == 0) {
+            terms_.back().coefficient += coefficient;
+            if (terms_.back().coefficient.isZero()) {
+                terms_.pop_back();
+                --numOrdered_;
             }
-            if (order == 0) {
-                terms_.back().coefficient += coefficient;
-                if (terms_.back().coefficient.isZero()) {
-                    terms_.pop_back();
-                    --numOrdered_;
-                }
-                continue;
-            }
+            return;
         }
-        const auto first = static_cast<std::uint32_t>(factors_.size());
-        factors_.insert(factors_.end(), added.begin(), added.end());
-        terms_.push_back({std::move(coefficient), first, t.numFactors, t.degree});
+        pushBack(std::move(coefficient), added, degree);
+        if (order < 0) ++numOrdered_;
+        return;
     }
-    // What waits is put in order when it outgrows what is: each term is then moved a logarithmic number of times.
+    pushBack(std::move(coefficient), added, degree);
+}
+
+// What waits is put in order when it outgrows what is: each term is then moved a logarithmic number of times.
+void Polynomial::normalizeWhatWaits() {
     if (terms_.size() - numOrdered_ > numOrdered_ + 32) normalize();
 }
 

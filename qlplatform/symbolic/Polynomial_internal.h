@@ -88,6 +88,8 @@ class Polynomial {
     void negate() { isNegated_ = !isNegated_; }
     /// Adds `other`, or subtracts it. Amortised logarithmic in the number of terms for each term of `other`.
     void add(const Polynomial& other, bool negated);
+    /// Adds a term; its coefficient is not 0 and atoms ascend.
+    void add(Integer coefficient, std::span<const Factor> factors);
     /// Puts the terms in order and unites like terms.
     void normalize();
 
@@ -120,6 +122,9 @@ class Polynomial {
     static std::uint64_t degreeOf(std::span<const Factor> factors);
 
   private:
+    void pushBack(Integer coefficient, std::span<const Factor> factors, std::uint64_t degree);
+    void gather(Integer coefficient, std::span<const Factor> added, std::uint64_t degree);
+    void normalizeWhatWaits();
     bool isOrdered() const { return numOrdered_ == terms_.size() && !isNegated_; }
     bool precedes(const Term& a, const Term& b) const;
     void compactFactors();

@@ -220,14 +220,6 @@ Value RationalArithmetic::quotient(Polynomial numerator, Polynomial denominator)
     return v;
 }
 
-Value RationalArithmetic::reducedQuotient(Value dividend, Value divisor) const {
-    settle(dividend);
-    settle(divisor);
-    dividend.denominator = std::move(divisor.numerator);
-    dividend.hasDoubles |= divisor.hasDoubles;
-    return dividend;
-}
-
 Value RationalArithmetic::negate(Value a) const {
     if (a.floating) return number(-*a.floating);
     a.numerator.negate();

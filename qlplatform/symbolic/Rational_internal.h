@@ -76,8 +76,6 @@ class RationalArithmetic {
     Value divide(Value a, Value b);
     /// The power with a whole exponent.
     Value power(Value base, std::int64_t exponent);
-    /// The quotient of two polynomials that are known to have no common divisor.
-    Value reducedQuotient(Value dividend, Value divisor) const;
 
     /// Brings what sums left undone to its end, so that the polynomials can be read. Floating numbers stay.
     void settle(Value& value) const;

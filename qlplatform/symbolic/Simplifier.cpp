@@ -7,53 +7,6 @@
 namespace QL {
 namespace {
 
-bool isArithmetic(SymbolicOp op) {
-    switch (op) {
-    case SymbolicOp::UnaryMinus:
-    case SymbolicOp::Plus:
-    case SymbolicOp::Minus:
-    case SymbolicOp::Multiply:
-    case SymbolicOp::Divide:
-    case SymbolicOp::Power:
-        return true;
-    default:
-        return false;
-    }
-}
-
-bool isSum(SymbolicOp op) { return op == SymbolicOp::Plus || op == SymbolicOp::Minus; }
-
-bool isNumber(SymbolicOp op) { return op == SymbolicOp::IntValue || op == SymbolicOp::DoubleValue; }
-
-// A simplified product of atoms with no number but a positive one in front, as factors.
-bool readFactors(const NodeStore& store, NodeId product, std::vector<Factor>& factors) {
-    std::vector<NodeId> parts;
-    for (; store.op(product) == SymbolicOp::Multiply; product = store.operand(product, 0))
-        parts.push_back(store.operand(product, 1));
-    parts.push_back(product);
-    for (std::size_t i = parts.size(); i-- > 0;) {
-        NodeId atom = parts[i];
-        std::uint64_t exponent = 1;
-        if (i + 1 == parts.size() && parts.size() > 1 && store.op(atom) == SymbolicOp::IntValue) {
-            if (store.intValue(atom) < 0) return false;
-            continue;
-        }
-        if (store.op(atom) == SymbolicOp::Power && store.op(store.operand(atom, 1)) == SymbolicOp::IntValue) {
-            exponent = static_cast<std::uint64_t>(store.intValue(store.operand(atom, 1)));
-            atom = store.operand(atom, 0);
-        }
-        if (isArithmetic(store.op(atom)) || isNumber(store.op(atom))) return false;
-        if (!factors.empty() && factors.back().atom == atom)
-            factors.back().exponent += exponent;
-        else
-            factors.push_back({atom, exponent});
-    }
-    return true;
-}
-
-// Of the values that are kept from call to call.
-constexpr std::size_t maxRecent = 1024;
-constexpr std::size_t maxRecentTerms = 16;
 // Room that the next walk may find; a larger one is given back.
 constexpr std::size_t maxKeptEntries = 4096;
 
@@ -71,50 +24,28 @@ void Simplifier::remember(NodeId id, NodeId form) {
     if (store_.simplified(id) == noNode) store_.setSimplified(id, store_.simplified(form));
 }
 
-const Value* Simplifier::recent(NodeId id) const {
-    if (recent_.empty()) return nullptr;
-    const Recent& slot = recent_[id & (recent_.size() - 1)];
-    return slot.id == id ? &slot.value : nullptr;
-}
-
-// Keeps a settled value that reading its expression again would give: a small one without an expression among its
-// atoms.
-void Simplifier::keep(NodeId id, const Value& value) {
-    if (value.floating || value.hasDoubles || !isArithmetic(store_.op(id))) return;
-    for (const Polynomial* p : {&value.numerator, value.denominator.get()}) {
-        if (!p) continue;
-        if (p->terms().size() > maxRecentTerms) return;
-        for (const auto& t : p->terms()) {
-            if (t.numFactors > maxRecentTerms) return;
-            for (const Factor& f : p->factors(t))
-                if (isArithmetic(store_.op(f.atom))) return;
-        }
-    }
-    if (recent_.size() < maxRecent && recent_.size() * 8 < store_.size())
-        recent_ = std::vector<Recent>(std::max<std::size_t>(16, recent_.size() * 2));
-    Recent& slot = recent_[id & (recent_.size() - 1)];
-    slot.id = id;
-    slot.value = value;
-}
-
-NodeId Simplifier::writeAndKeep(NodeId id, Value& value) {
-    const NodeId form = arithmetic_.write(value);
-    remember(id, form);
-    keep(form, value);
+NodeId Simplifier::written(NodeId id, Value& value) {
+    remember(id, arithmetic_.write(value));
     return store_.simplified(id);
 }
 
 NodeId Simplifier::simplify(NodeId root) {
     if (store_.simplified(root) != noNode) return store_.simplified(root);
-    if (const NodeId form = appended(root); form != noNode) {
+    if (const NodeId form = extended(root); form != noNode) {
         remember(root, form);
         return store_.simplified(root);
+    }
+    if (isArithmetic(store_.op(root))) {
+        if (auto sum = reader_.plainSum(root)) {
+            Value value = arithmetic_.polynomial(*std::move(sum));
+            return written(root, value);
+        }
     }
     forgetWalk(); // of a call that ended early
     listEntries(root);
     for (const std::uint32_t index : order_)
         if (!isInnerPart(entries_[index])) entries_[index].value = stored(evaluate(entries_[index]));
-    const NodeId form = writeAndKeep(root, values_[entries_[order_.back()].value]);
+    const NodeId form = written(root, values_[entries_[order_.back()].value]);
     forgetWalk();
     return form;
 }
@@ -129,8 +60,9 @@ NodeId Simplifier::atHand(NodeId id) {
     return store_.numOperands(id) == 0 ? id : simplify(id);
 }
 
-// A sum or product that only grows at its end is the commonest case of all, and costs as much as its last part.
-NodeId Simplifier::appended(NodeId root) {
+// A simplified sum or product that gets one more part is the commonest case of all. It costs as much as what stands
+// behind the place of that part.
+NodeId Simplifier::extended(NodeId root) {
     const SymbolicOp op = store_.op(root);
     if (!isSum(op) && op != SymbolicOp::Multiply) return noNode;
     const NodeId left = store_.simplified(store_.operand(root, 0));
@@ -138,37 +70,78 @@ NodeId Simplifier::appended(NodeId root) {
         return noNode;
     const NodeId added = atHand(store_.operand(root, 1));
     if (added == noNode) return noNode;
-    return isSum(op) ? appendedTerm(op, left, added) : appendedFactor(left, added);
+    return isSum(op) ? withTerm(left, op, added) : withFactor(left, added);
 }
 
-// Three terms at least: the first two may have changed places. A number stays the last term.
-NodeId Simplifier::appendedTerm(SymbolicOp op, NodeId sum, NodeId term) const {
-    if (!isSum(store_.op(sum)) || !isSum(store_.op(store_.operand(sum, 0)))) return noNode;
-    if (isNumber(store_.op(store_.operand(sum, 1))) && !isNumber(store_.op(term))) {
-        const NodeId inner = appendedTerm(op, store_.operand(sum, 0), term);
-        return inner == noNode ? noNode : store_.binary(store_.op(sum), inner, store_.operand(sum, 1));
+// Only for what is put in without changing another term, and where the first two have not changed places.
+NodeId Simplifier::withTerm(NodeId sum, SymbolicOp op, NodeId term) {
+    const auto isPlain = [](const ExprReader::Product& p) {
+        return p.coefficient.sign() > 0 && !p.hasDoubles && !p.hasQuotients;
+    };
+    const ExprReader::Product added = reader_.simplifiedTerm(term);
+    if (isSum(store_.op(term)) || !isPlain(added)) return noNode;
+    const auto orderOf = [&](const ExprReader::Product& other) {
+        return Polynomial::compareMonomials(Polynomial::degreeOf(other.atoms()), other.atoms(),
+                                            Polynomial::degreeOf(added.atoms()), added.atoms());
+    };
+    behind_.clear();
+    SymbolicOp behindFirst = SymbolicOp::Plus;
+    while (isSum(store_.op(sum))) {
+        behindFirst = store_.op(sum);
+        const bool isPair = !isSum(store_.op(store_.operand(sum, 0)));
+        if (isPair && behindFirst == SymbolicOp::Minus) return noNode;
+        const ExprReader::Product last = reader_.simplifiedTerm(store_.operand(sum, 1));
+        const int order = orderOf(last);
+        if (!isPlain(last) || order == 0) return noNode;
+        if (order < 0) break;
+        behind_.emplace_back(behindFirst, store_.operand(sum, 1));
+        sum = store_.operand(sum, 0);
     }
-    std::vector<Factor> last;
-    std::vector<Factor> added;
-    if (!readFactors(store_, store_.operand(sum, 1), last) || !readFactors(store_, term, added)) return noNode;
-    const int order =
-        Polynomial::compareMonomials(Polynomial::degreeOf(last), last, Polynomial::degreeOf(added), added);
-    return order < 0 ? store_.binary(op, sum, term) : noNode;
+    if (isSum(store_.op(sum))) {
+        sum = store_.binary(op, sum, term);
+    } else {
+        const ExprReader::Product first = reader_.simplifiedTerm(sum);
+        const int order = orderOf(first);
+        if (!isPlain(first) || first.factors.empty() || order == 0) return noNode; // also a number of several values
+        const bool isInFront = order > 0 && op == SymbolicOp::Plus; // a negative one changes places again
+        sum = isInFront ? store_.binary(op, term, sum) : store_.binary(op, sum, term);
+    }
+    for (std::size_t i = behind_.size(); i-- > 0;)
+        sum = store_.binary(behind_[i].first, sum, behind_[i].second);
+    return sum;
 }
 
-NodeId Simplifier::appendedFactor(NodeId product, NodeId factor) const {
-    if (store_.op(product) != SymbolicOp::Multiply) return noNode;
-    std::vector<Factor> added;
-    std::vector<Factor> last;
-    if (store_.op(factor) == SymbolicOp::Multiply || !readFactors(store_, factor, added)) return noNode;
-    const NodeId end = store_.operand(product, 1);
-    if (store_.op(end) == SymbolicOp::Multiply || !readFactors(store_, end, last)) return noNode;
-    return last[0].atom < added[0].atom ? store_.binary(SymbolicOp::Multiply, product, factor) : noNode;
+NodeId Simplifier::withFactor(NodeId product, NodeId factor) const {
+    if (store_.op(factor) == SymbolicOp::Multiply || store_.op(store_.operand(product, 1)) == SymbolicOp::Multiply)
+        return noNode;
+    const auto soleFactor = [&](NodeId id) {
+        const ExprReader::Product p = reader_.simplifiedTerm(id);
+        const bool isSole = p.coefficient.isOne() && p.factors.size() == 1 && !p.hasDoubles;
+        return isSole && !isArithmetic(store_.op(p.factors[0].atom)) ? p.factors[0].atom : noNode;
+    };
+    const NodeId last = soleFactor(store_.operand(product, 1));
+    const NodeId added = soleFactor(factor);
+    if (last == noNode || added == noNode || last >= added) return noNode;
+    return store_.binary(SymbolicOp::Multiply, product, factor);
 }
 
-bool Simplifier::hasWork(NodeId id) const {
-    if (store_.numOperands(id) == 0) return false;
-    return store_.simplified(id) == noNode || (isArithmetic(store_.op(id)) && !recent(id));
+bool Simplifier::hasWork(NodeId id) const { return store_.numOperands(id) != 0 && store_.simplified(id) == noNode; }
+
+// Read as it was written: what stands in it without having been multiplied out or added up is an atom.
+Value Simplifier::simplifiedValue(NodeId id) {
+    const SymbolicOp op = store_.op(id);
+    if (!isArithmetic(op)) return arithmetic_.leaf(id);
+    const bool isQuotient = op == SymbolicOp::Divide && !reader_.isZero(store_.operand(id, 1));
+    ExprReader::Sum above = reader_.simplifiedSum(isQuotient ? store_.operand(id, 0) : id);
+    Value value = arithmetic_.polynomial(std::move(above.polynomial));
+    value.hasDoubles = above.hasDoubles;
+    value.hasOpaqueQuotient = above.hasQuotients;
+    if (!isQuotient) return value;
+    ExprReader::Sum below = reader_.simplifiedSum(store_.operand(id, 1));
+    value.denominator = std::move(below.polynomial);
+    value.hasDoubles |= below.hasDoubles;
+    value.hasOpaqueQuotient |= below.hasQuotients;
+    return value;
 }
 
 void Simplifier::forgetWalk() {
@@ -240,20 +213,11 @@ Value Simplifier::take(NodeId operand) {
     return std::move(value);
 }
 
-// The value of a factor. A sum inside a product that is simplified has not been multiplied out, and is not now.
-Value Simplifier::takeFactor(NodeId product, NodeId factor) {
-    Value value = take(factor);
-    if (store_.simplified(product) != product || !isSum(store_.op(factor))) return value;
-    arithmetic_.settle(value);
-    return value.isNumber() ? value : arithmetic_.polynomial(Polynomial(factor));
-}
-
 Value Simplifier::evaluate(const Entry& entry) {
     const NodeId id = entry.id;
     if (!entry.isEntered) {
-        if (const Value* kept = recent(id)) return *kept;
         if (store_.simplified(id) == noNode) store_.setSimplified(id, id);
-        return arithmetic_.leaf(id);
+        return simplifiedValue(id);
     }
     const SymbolicOp op = store_.op(id);
     switch (op) {
@@ -267,13 +231,15 @@ Value Simplifier::evaluate(const Entry& entry) {
     case SymbolicOp::Multiply: {
         if (store_.operand(id, 0) == store_.operand(id, 1)) {
             --entryOf(store_.operand(id, 0)).numUses; // two at once
-            return arithmetic_.square(takeFactor(id, store_.operand(id, 0)));
+            return arithmetic_.square(take(store_.operand(id, 0)));
         }
-        Value left = takeFactor(id, store_.operand(id, 0));
-        return arithmetic_.multiply(std::move(left), takeFactor(id, store_.operand(id, 1)));
+        Value left = take(store_.operand(id, 0));
+        return arithmetic_.multiply(std::move(left), take(store_.operand(id, 1)));
     }
-    case SymbolicOp::Divide:
-        return evaluateQuotient(id);
+    case SymbolicOp::Divide: {
+        Value left = take(store_.operand(id, 0));
+        return arithmetic_.divide(std::move(left), take(store_.operand(id, 1)));
+    }
     case SymbolicOp::Power:
         return evaluatePower(id);
     default:
@@ -290,8 +256,7 @@ Value Simplifier::evaluateOther(NodeId id) {
         std::vector<Value> operands;
         for (std::size_t i = 0; i < store_.numOperands(id); ++i) {
             operands.push_back(take(store_.operand(id, i)));
-            if (store_.simplified(store_.operand(id, i)) == noNode)
-                writeAndKeep(store_.operand(id, i), operands.back());
+            if (store_.simplified(store_.operand(id, i)) == noNode) written(store_.operand(id, i), operands.back());
         }
         result = laws_.apply(op, operands);
     }
@@ -299,18 +264,8 @@ Value Simplifier::evaluateOther(NodeId id) {
     return result;
 }
 
-Value Simplifier::evaluateQuotient(NodeId id) {
-    Value left = take(store_.operand(id, 0));
-    Value right = take(store_.operand(id, 1));
-    if (store_.simplified(id) == id && left.isPolynomial() && right.isPolynomial()) {
-        arithmetic_.settle(right);
-        if (!right.isZero()) return arithmetic_.reducedQuotient(std::move(left), std::move(right));
-    }
-    return arithmetic_.divide(std::move(left), std::move(right));
-}
-
 Value Simplifier::evaluatePower(NodeId id) {
-    Value base = takeFactor(id, store_.operand(id, 0));
+    Value base = take(store_.operand(id, 0));
     Value exponent = take(store_.operand(id, 1));
     arithmetic_.settle(exponent);
     if (!base.floating && exponent.isNumber() && arithmetic_.isInteger(exponent)) {
@@ -336,7 +291,7 @@ Value Simplifier::evaluateLattice(NodeId id) {
                 open.push_back(entryOf(operand).id);
             } else {
                 Value value = take(operand);
-                operands.push_back(store_.simplified(operand) == noNode ? writeAndKeep(operand, value)
+                operands.push_back(store_.simplified(operand) == noNode ? written(operand, value)
                                                                         : store_.simplified(operand));
             }
         }
@@ -347,7 +302,7 @@ Value Simplifier::evaluateLattice(NodeId id) {
 std::size_t Simplifier::sizeInMemory() const {
     return slots_.sizeInMemory() + entries_.capacity() * sizeof(Entry) +
            (order_.capacity() + freeValues_.capacity()) * sizeof(std::uint32_t) + values_.capacity() * sizeof(Value) +
-           recent_.capacity() * sizeof(Recent);
+           behind_.capacity() * sizeof(behind_[0]);
 }
 
 SymbolicExprSimplify::SymbolicExprSimplify(SymbolicExprTable& table, int, bool) : table_(table) {}

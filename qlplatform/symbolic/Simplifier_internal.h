@@ -4,6 +4,7 @@
 
 #include <vector>
 
+#include "qlplatform/symbolic/ExprReader_internal.h"
 #include "qlplatform/symbolic/Rational_internal.h"
 #include "qlplatform/symbolic/SimplifyLaws_internal.h"
 
@@ -11,7 +12,7 @@ namespace QL {
 
 class Simplifier {
   public:
-    explicit Simplifier(NodeStore& store) : store_(store), arithmetic_(store), laws_(arithmetic_) {}
+    explicit Simplifier(NodeStore& store) : store_(store), reader_(store), arithmetic_(store), laws_(arithmetic_) {}
 
     NodeId simplify(NodeId root);
 
@@ -29,40 +30,32 @@ class Simplifier {
         bool isUsedByLikeOnly = true;  // every user has the same operator
     };
 
-    // The value of a simplified expression that was met lately.
-    struct Recent {
-        NodeId id = noNode;
-        Value value;
-    };
-
     // The form of a node that the walk goes on with: simplified where that is known.
     NodeId known(NodeId id) const { return store_.simplified(id) == noNode ? id : store_.simplified(id); }
     void remember(NodeId id, NodeId form);
-    NodeId writeAndKeep(NodeId id, Value& value);
-    const Value* recent(NodeId id) const;
-    void keep(NodeId id, const Value& value);
+    NodeId written(NodeId id, Value& value);
 
     NodeId atHand(NodeId id);
-    NodeId appended(NodeId root);
-    NodeId appendedTerm(SymbolicOp op, NodeId sum, NodeId term) const;
-    NodeId appendedFactor(NodeId product, NodeId factor) const;
+    NodeId extended(NodeId root);
+    NodeId withTerm(NodeId sum, SymbolicOp op, NodeId term);
+    NodeId withFactor(NodeId product, NodeId factor) const;
 
     bool hasWork(NodeId id) const;
+    Value simplifiedValue(NodeId id);
     void listEntries(NodeId root);
     bool isInnerPart(const Entry& entry) const;
     Entry& entryOf(NodeId operand);
     std::uint32_t stored(Value value);
     Value take(NodeId operand);
-    Value takeFactor(NodeId product, NodeId factor);
     void forgetWalk();
 
     Value evaluate(const Entry& entry);
     Value evaluatePower(NodeId id);
-    Value evaluateQuotient(NodeId id);
     Value evaluateOther(NodeId id);
     Value evaluateLattice(NodeId id);
 
     NodeStore& store_;
+    ExprReader reader_;
     RationalArithmetic arithmetic_;
     SimplifyLaws laws_;
     NodeSlots slots_; // of the walk: entries by node
@@ -70,7 +63,7 @@ class Simplifier {
     std::vector<std::uint32_t> order_; // entries, operands before their users
     std::vector<Value> values_;
     std::vector<std::uint32_t> freeValues_;
-    std::vector<Recent> recent_; // by the low bits of the id
+    std::vector<std::pair<SymbolicOp, NodeId>> behind_; // what follows the place of a term in a sum, last first
 };
 
 } // namespace QL

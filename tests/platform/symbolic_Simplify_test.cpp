@@ -379,6 +379,60 @@ TEST(SymbolicCanonical, OneFormExactlyWhenEqual) {
     EXPECT_GT(numEqual, 150u);
 }
 
+const std::vector<SymbolicOp> rationalOperators = {SymbolicOp::UnaryMinus, SymbolicOp::Plus,     SymbolicOp::Minus,
+                                                   SymbolicOp::Multiply,   SymbolicOp::Multiply, SymbolicOp::Divide,
+                                                   SymbolicOp::Power};
+
+// What was simplified before, divisions by 0 among it, does not show.
+TEST(SymbolicCanonical, ThePastOfATableChangesNoForm) {
+    const std::vector<std::string> names = {"K", "L", "M", "N"};
+    QL::SymbolicExprTable table;
+    std::vector<E> symbols;
+    for (const std::string& name : names)
+        symbols.push_back(symbol(table, name));
+    for (unsigned seed = 20'000; seed < 24'000; ++seed) {
+        std::mt19937 random(seed);
+        const E raw = randomExpression(random, symbols, {rationalOperators, 3, 6});
+        const std::string form = text(simplified(raw));
+        if (form.find("/0") != std::string::npos || form.find("pow(0") != std::string::npos) continue; // an atom
+        QL::SymbolicExprTable fresh;
+        for (const std::string& name : names)
+            fresh.addSymbol(name);
+        const E copy{&fresh, QL::SymbolicExprCopy(table, fresh).copy(raw.id)};
+        ASSERT_EQ(text(simplified(copy)), form) << "seed " << seed << ": " << text(raw);
+    }
+}
+
+// A sum that gets its terms one by one, in any order, is the sum of all at once.
+TEST(SymbolicCanonical, SumsOfHandlesHaveTheFormOfTheWholeSum) {
+    for (unsigned seed = 13'000'000; seed < 13'002'000; ++seed) {
+        QL::SymbolicExprTable table(QL::SymbolDomain::Integers);
+        std::mt19937 random(seed);
+        std::vector<E> symbols;
+        for (int i = 0; i < 5; ++i)
+            symbols.push_back(symbol(table, "s" + std::to_string(i)));
+        const auto anyTerm = [&] {
+            const int value = static_cast<int>(random() % 9) - 4;
+            E term = random() % 8 == 0 ? number(table, 0.25) : number(table, value);
+            if (random() % 16 == 0) term = number(table, 2'147'483'647) * number(table, 2'147'483'645);
+            for (auto i = random() % 4; i-- > 0;)
+                term = term * symbols[random() % symbols.size()];
+            if (random() % 16 == 0) term = term / (symbols[0] + number(table, 1));
+            return random() % 2 ? simplified(term) : term;
+        };
+        E whole = anyTerm();
+        E stepwise = simplified(whole);
+        for (int i = 0; i < 12; ++i) {
+            const E term = anyTerm();
+            const bool isSubtracted = random() % 3 == 0;
+            whole = isSubtracted ? whole - term : whole + term;
+            stepwise = simplified(isSubtracted ? stepwise - term : stepwise + term);
+            ASSERT_EQ(stepwise.id, simplified(whole).id)
+                << "seed " << seed << ": " << text(stepwise) << " and " << text(simplified(whole));
+        }
+    }
+}
+
 // The form is a fixed point of its own accord, not because it is remembered.
 TEST(SymbolicCanonical, TheFormIsSimplifiedToItselfInANewTable) {
     for (unsigned seed = 12'000'000; seed < 12'003'000; ++seed) {
@@ -489,6 +543,27 @@ TEST_F(SymbolicLarge, SharingIsNotMultipliedOut) {
     for (int i = 0; i < 40; ++i)
         sum = sum + sum;
     EXPECT_EQ(text(simplified(sum)), "1099511627776.0*K");
+}
+
+// A factor of what was too large to be multiplied out is still multiplied out by itself.
+TEST_F(SymbolicLarge, PartsOfWhatIsBeyondTheBoundsHaveTheirOwnForms) {
+    const auto sumOf = [&](int first, int numTerms) {
+        E sum = s(first);
+        for (int i = 1; i < numTerms; ++i)
+            sum = sum + s(first + i);
+        return simplified(sum);
+    };
+    const E two = number(table, 2), minusOne = number(table, -1);
+    const E a = sumOf(0, 200), b = sumOf(200, 200), c = sumOf(400, 60);
+    for (const E& tooLarge : {two * a * b, minusOne * k * a * b, k * a * b, a * b + k * a * b})
+        EXPECT_EQ(simplified(simplified(tooLarge) - tooLarge).id, table.addInt(0));
+    simplified(make(SymbolicOp::Power, c, number(table, 3)));
+    EXPECT_EQ(simplified(two * a).id, simplified(a + a).id);
+    EXPECT_EQ(simplified(minusOne * k).id, simplified(-k).id);
+    EXPECT_EQ(simplified(k * a).id, simplified(a * k).id);
+    EXPECT_EQ(simplified(c * c).id, simplified((c + k) * c - k * c).id);
+    simplified(k / number(table, 0) * -one * s(500));
+    EXPECT_EQ(simplified(minusOne * s(500)).id, simplified(-s(500)).id);
 }
 
 TEST_F(SymbolicLarge, BeyondTheBoundsEqualsAreStillFoundWhereTheyLookAlike) {
