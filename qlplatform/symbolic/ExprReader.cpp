@@ -137,14 +137,14 @@ ExprReader::Product ExprReader::simplifiedTerm(NodeId term) const {
     return atom;
 }
 
-void ExprReader::listTerms(NodeId sum) {
+void ExprReader::listTerms(NodeId sum) const {
     terms_.clear();
     for (; isSum(store_.op(sum)); sum = store_.operand(sum, 0))
         terms_.emplace_back(store_.operand(sum, 1), store_.op(sum) == SymbolicOp::Minus);
     terms_.emplace_back(sum, false);
 }
 
-ExprReader::Sum ExprReader::simplifiedSum(NodeId sum) {
+ExprReader::Sum ExprReader::simplifiedSum(NodeId sum) const {
     Sum read;
     listTerms(sum);
     for (std::size_t i = terms_.size(); i-- > 0;) {
@@ -160,7 +160,7 @@ ExprReader::Sum ExprReader::simplifiedSum(NodeId sum) {
     return read;
 }
 
-std::optional<Polynomial> ExprReader::plainSum(NodeId sum) {
+std::optional<Polynomial> ExprReader::plainSum(NodeId sum) const {
     Polynomial read;
     listTerms(sum);
     for (std::size_t i = terms_.size(); i-- > 0;) {

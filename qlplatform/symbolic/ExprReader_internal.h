@@ -44,11 +44,11 @@ class ExprReader {
     /// A term of a simplified sum, or a simplified product. A sum in it that was not multiplied out is an atom.
     Product simplifiedTerm(NodeId term) const;
     /// A simplified expression that is no quotient.
-    Sum simplifiedSum(NodeId sum);
+    Sum simplifiedSum(NodeId sum) const;
 
     /// A sum of products of integer values, symbols and other atoms that are simplified, with nothing else in it but
     /// what it says; nothing for any other expression, and for one beyond the limits.
-    std::optional<Polynomial> plainSum(NodeId sum);
+    std::optional<Polynomial> plainSum(NodeId sum) const;
 
     /// Whether it is the number 0.
     bool isZero(NodeId id) const;
@@ -63,10 +63,11 @@ class ExprReader {
     std::optional<std::uint64_t> wholeExponent(NodeId exponent, Form form) const;
     std::optional<Integer> numberIn(NodeId id) const;
     std::optional<Integer> wholeNumber(NodeId leaf) const;
-    void listTerms(NodeId sum);
+    void listTerms(NodeId sum) const;
 
     const NodeStore& store_;
-    std::vector<std::pair<NodeId, bool>> terms_; // of the sum that is read, and whether each is subtracted; last first
+    mutable std::vector<std::pair<NodeId, bool>>
+        terms_; // of the sum that is read, and whether each is subtracted; last first
 };
 
 } // namespace QL

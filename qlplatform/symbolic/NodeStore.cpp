@@ -62,9 +62,18 @@ NodeId NodeStore::append(const Key& key) {
         record.first = static_cast<std::uint32_t>(pool_.size());
         pool_.insert(pool_.end(), key.pooled.begin(), key.pooled.end());
     }
+    if (ids_.size() == ids_.max_load()) growIds();
     records_.push_back(record);
     ids_.insert(id);
     return id;
+}
+
+// In the order of the records, which the set by itself would read at random.
+void NodeStore::growIds() {
+    decltype(ids_) larger(2 * ids_.size() + 1, KeyHash{this}, KeyEqual{this});
+    for (NodeId id = 0; id < records_.size(); ++id)
+        larger.insert(id);
+    ids_.swap(larger);
 }
 
 bool NodeStore::isIntegerNode(const Key& key) const {

@@ -144,6 +144,7 @@ class NodeStore {
     bool matches(const Key& key, NodeId id) const;
     NodeId intern(const Key& key);
     NodeId append(const Key& key);
+    void growIds();
     bool isIntegerNode(const Key& key) const;
 
     SymbolDomain domain_;

@@ -102,6 +102,8 @@ void RationalArithmetic::settle(Value& value) const {
     }
     Polynomial below = value.denominator.taken();
     Polynomial::removeCommonDivisor(value.numerator, below);
+    expandSoleSum(value.numerator);
+    expandSoleSum(below);
     value.denominator = std::move(below);
 }
 
@@ -192,6 +194,37 @@ Polynomial RationalArithmetic::collapsed(const Polynomial& p) {
     rest.divideExactly(content);
     const Factor atom{writer_.write(rest), 1};
     return Polynomial(content, {&atom, 1});
+}
+
+// A sum becomes the atom that stands for it where a product that was not multiplied out has that atom, so that it can
+// be cancelled.
+void RationalArithmetic::collapseIfFactor(Polynomial& p, const Polynomial& product) {
+    if (p.terms().size() < 2 || product.terms().size() != 1) return;
+    const auto factors = product.factors(product.terms()[0]);
+    if (std::ranges::none_of(factors, [&](const Factor& f) { return isSum(store_.op(f.atom)); })) return;
+    Polynomial atom = collapsed(p);
+    const NodeId sum = atom.factors(atom.terms()[0])[0].atom;
+    if (std::ranges::any_of(factors, [&](const Factor& f) { return f.atom == sum; })) p = std::move(atom);
+}
+
+// Of a product that was not multiplied out because of its length, one sum can be left by a division.
+void RationalArithmetic::expandSoleSum(Polynomial& p) const {
+    if (p.terms().size() != 1) return;
+    const auto& term = p.terms()[0];
+    std::vector<Factor> others;
+    NodeId sum = noNode;
+    for (const Factor& f : p.factors(term)) {
+        if (!isSum(store_.op(f.atom)))
+            others.push_back(f);
+        else if (sum == noNode && f.exponent == 1)
+            sum = f.atom;
+        else
+            return;
+    }
+    if (sum == noNode) return;
+    if (auto expanded =
+            Polynomial::product(Polynomial(term.coefficient, others), reader_.simplifiedSum(sum).polynomial))
+        p = *std::move(expanded);
 }
 
 Polynomial RationalArithmetic::times(const Polynomial& a, const Polynomial& b) {
@@ -332,11 +365,19 @@ Value RationalArithmetic::multiply(Value a, Value b) {
         if (!a.denominator.isOne() || !b.denominator.isOne()) {
             Polynomial belowA = a.denominator.taken();
             Polynomial belowB = b.denominator.taken();
-            Polynomial::removeCommonDivisor(a.numerator, belowB);
-            Polynomial::removeCommonDivisor(b.numerator, belowA);
-            a.denominator = times(belowA, belowB);
+            for (const auto& [above, below] : {std::pair(&a.numerator, &belowB), std::pair(&b.numerator, &belowA)}) {
+                collapseIfFactor(*above, *below);
+                collapseIfFactor(*below, *above);
+                Polynomial::removeCommonDivisor(*above, *below);
+            }
+            Polynomial below = times(belowA, belowB);
+            expandSoleSum(below);
+            a.denominator = std::move(below);
+            a.numerator = times(a.numerator, b.numerator);
+            expandSoleSum(a.numerator);
+        } else {
+            a.numerator = times(a.numerator, b.numerator);
         }
-        a.numerator = times(a.numerator, b.numerator);
     }
     a.hasDoubles = hasDoubles;
     a.hasOpaqueQuotient = hasOpaqueQuotient;

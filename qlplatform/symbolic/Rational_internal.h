@@ -8,6 +8,7 @@
 #include <memory>
 #include <optional>
 
+#include "qlplatform/symbolic/ExprReader_internal.h"
 #include "qlplatform/symbolic/ExprWriter_internal.h"
 #include "qlplatform/symbolic/NodeStore_internal.h"
 #include "qlplatform/symbolic/Polynomial_internal.h"
@@ -57,7 +58,7 @@ struct Value {
 
 class RationalArithmetic {
   public:
-    explicit RationalArithmetic(NodeStore& store) : store_(store), writer_(store) {}
+    explicit RationalArithmetic(NodeStore& store) : store_(store), reader_(store), writer_(store) {}
 
     /// The value of a node that has no arithmetic inside: a number, or the node as atom.
     Value leaf(NodeId id) const;
@@ -96,6 +97,8 @@ class RationalArithmetic {
     void uniteDoubles(Polynomial& p) const;
     Polynomial collapsed(const Polynomial& p);
     Polynomial times(const Polynomial& a, const Polynomial& b);
+    void collapseIfFactor(Polynomial& p, const Polynomial& product);
+    void expandSoleSum(Polynomial& p) const;
     Polynomial raised(const Polynomial& base, std::uint64_t exponent);
     bool gather(Value& a, Value& b, bool subtracts) const;
     std::optional<Value> sumOfQuotients(const Value& a, const Value& b, bool subtracts) const;
@@ -103,6 +106,7 @@ class RationalArithmetic {
     Value opaque(SymbolicOp op, Value& a, Value& b);
 
     NodeStore& store_;
+    ExprReader reader_;
     ExprWriter writer_;
 };
 

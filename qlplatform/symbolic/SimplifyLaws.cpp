@@ -186,6 +186,8 @@ Value SimplifyLaws::remainder(SymbolicOp op, Value a, Value b) {
     const bool mayDivide = a.denominator.isOne() || !b.denominator.isOne(); // a denominator does not go away
     if (mayDivide && arithmetic_.isInteger(arithmetic_.divide(a, b))) return arithmetic_.number(Integer(0));
 
+    if (op == SymbolicOp::Mod) dropMultiples(a, b);
+
     // A remainder is its own remainder by the same divisor, and by a number that is not smaller.
     const NodeId inner = soleAtom(a);
     if (inner != noNode && store_.op(inner) == op) {
@@ -199,6 +201,17 @@ Value SimplifyLaws::remainder(SymbolicOp op, Value a, Value b) {
     return binaryAtom(op, a, b);
 }
 
+// mod(K + 3*L, L) is mod(K, L), and mod(K + 5, 4) is mod(K + 1, 4): whole multiples of the divisor do not count.
+void SimplifyLaws::dropMultiples(Value& a, const Value& b) const {
+    if (!b.denominator.isOne() || b.numerator.terms().size() != 1) return;
+    const auto divisor = Polynomial::product(b.numerator, a.denominator.polynomial());
+    if (!divisor || divisor->terms().size() != 1) return;
+    takeWholeMultiples(a.numerator, *divisor);
+    const bool hasDoubles = a.hasDoubles;
+    a = arithmetic_.quotient(std::move(a.numerator), a.denominator.taken());
+    a.hasDoubles = hasDoubles;
+}
+
 Value SimplifyLaws::rounded(SymbolicOp op, Value a) {
     if (a.floating) return arithmetic_.number(roundedDouble(op, *a.floating));
     if (a.isNumber()) return arithmetic_.number(roundedQuotient(op, a.numerator.constant(), denominatorOf(a)));
@@ -209,36 +222,44 @@ Value SimplifyLaws::rounded(SymbolicOp op, Value a) {
     return unaryAtom(op, a);
 }
 
-// floor(K + x) is K + floor(x), and floor((5*K + L)/2) is 2*K + floor((K + L)/2), for whole K. Each term gives what
-// its coefficient holds of the denominator, rounded towards zero, when the denominator is a single term.
+// Takes out of the numerator the terms, or the part of their coefficients rounded towards zero, that are whole
+// multiples of a single term, and returns the multiples.
+Polynomial SimplifyLaws::takeWholeMultiples(Polynomial& numerator, const Polynomial& divisor) const {
+    const Integer& times = divisor.terms()[0].coefficient;
+    const auto divided = divisor.factors(divisor.terms()[0]);
+    Polynomial whole;
+    Polynomial rest;
+    std::vector<Factor> left;
+    for (const auto& t : numerator.terms()) {
+        const auto factors = numerator.factors(t);
+        left.assign(factors.begin(), factors.end());
+        bool isDivisible = true;
+        for (const Factor& d : divided) {
+            const auto at = std::find_if(left.begin(), left.end(), [&](const Factor& f) { return f.atom == d.atom; });
+            isDivisible = isDivisible && at != left.end() && at->exponent >= d.exponent;
+            if (isDivisible) at->exponent -= d.exponent;
+        }
+        std::erase_if(left, [](const Factor& f) { return f.exponent == 0; });
+        Integer multiple;
+        if (isDivisible && areIntegers(left)) multiple = Integer::truncatedQuotient(t.coefficient, times);
+        const Integer remaining = t.coefficient - multiple * times;
+        if (!multiple.isZero()) whole.add(std::move(multiple), left);
+        if (!remaining.isZero()) rest.add(remaining, factors);
+    }
+    whole.normalize();
+    rest.normalize();
+    numerator = std::move(rest);
+    return whole;
+}
+
+// floor(K + x) is K + floor(x), and floor((5*K + L)/2) is 2*K + floor((K + L)/2), for whole K.
 Value SimplifyLaws::wholePartsOut(SymbolicOp op, Value a) {
     const Polynomial below = a.denominator.polynomial();
     Value whole = arithmetic_.number(Integer(0));
     if (below.terms().size() == 1) {
-        const Integer& divisor = below.terms()[0].coefficient;
-        const auto divided = below.factors(below.terms()[0]);
-        Polynomial rest;
-        std::vector<Factor> left;
-        for (const auto& t : a.numerator.terms()) {
-            const auto factors = a.numerator.factors(t);
-            left.assign(factors.begin(), factors.end());
-            bool isDivisible = true;
-            for (const Factor& d : divided) {
-                const auto at =
-                    std::find_if(left.begin(), left.end(), [&](const Factor& f) { return f.atom == d.atom; });
-                isDivisible = isDivisible && at != left.end() && at->exponent >= d.exponent;
-                if (isDivisible) at->exponent -= d.exponent;
-            }
-            std::erase_if(left, [](const Factor& f) { return f.exponent == 0; });
-            Integer times;
-            if (isDivisible && areIntegers(left)) times = Integer::truncatedQuotient(t.coefficient, divisor);
-            if (!times.isZero()) whole.numerator.add(Polynomial(times, left), false);
-            const Integer remaining = t.coefficient - times * divisor;
-            if (!remaining.isZero()) rest.add(Polynomial(remaining, factors), false);
-        }
-        rest.normalize();
+        whole.numerator = takeWholeMultiples(a.numerator, below);
         const bool hasDoubles = a.hasDoubles;
-        a = arithmetic_.quotient(std::move(rest), below);
+        a = arithmetic_.quotient(std::move(a.numerator), below);
         a.hasDoubles = hasDoubles;
     }
     if (a.isNumber()) return arithmetic_.add(std::move(whole), rounded(op, std::move(a)), false);

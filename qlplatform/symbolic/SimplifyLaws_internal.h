@@ -26,6 +26,8 @@ class SimplifyLaws {
     Value power(Value& base, Value& exponent);
     Value remainder(SymbolicOp op, Value a, Value b);
     Value remainderOfNumbers(SymbolicOp op, Value& a, Value& b);
+    void dropMultiples(Value& a, const Value& b) const;
+    Polynomial takeWholeMultiples(Polynomial& numerator, const Polynomial& divisor) const;
     Value rounded(SymbolicOp op, Value a);
     Value wholePartsOut(SymbolicOp op, Value a);
     Value absolute(Value a);

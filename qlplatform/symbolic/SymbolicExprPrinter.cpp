@@ -19,14 +19,14 @@ class TextWriter {
           hostNumbers_(hostNumbers), hostFunctions_(hostFunctions) {}
 
     std::string write(NodeId root) {
-        open_.push_back({root, orLevel, {}});
+        open_.push_back({root, orLevel, false, {}});
         while (!open_.empty() && text_.size() <= SymbolicExprPrinter::maxTextLength) {
             const Piece piece = open_.back();
             open_.pop_back();
             if (piece.node == noNode)
                 text_ += piece.text;
             else
-                writeNode(piece.node, piece.level);
+                writeNode(piece);
         }
         if (text_.size() > SymbolicExprPrinter::maxTextLength) {
             text_.resize(SymbolicExprPrinter::maxTextLength);
@@ -40,13 +40,16 @@ class TextWriter {
     struct Piece {
         NodeId node;
         Level level;
+        bool isBase; // of a power
         std::string_view text;
     };
 
-    void later(std::string_view text) { open_.push_back({noNode, orLevel, text}); }
-    void later(NodeId node, Level level) { open_.push_back({node, level, {}}); }
+    void later(std::string_view text) { open_.push_back({noNode, orLevel, false, text}); }
+    void later(NodeId node, Level level, bool isBase = false) { open_.push_back({node, level, isBase, {}}); }
 
-    void writeNode(NodeId id, Level allowed) {
+    void writeNode(const Piece& piece) {
+        const NodeId id = piece.node;
+        const Level allowed = piece.level;
         const std::size_t numOperands = store_.numOperands(id);
         const SymbolicOp op = store_.op(id);
         if (op == SymbolicOp::ND) return writeList(id, "[", " ", "]");
@@ -66,21 +69,39 @@ class TextWriter {
             writeSigned(op, store_.operand(id, 0));
             return;
         }
-        later(store_.operand(id, 1), static_cast<Level>(spelling.level + 1));
+        const bool takesSign = op == SymbolicOp::Power && (isEnclosed || !piece.isBase);
+        later(store_.operand(id, 1),
+              takesSign && isSignedOperand(store_.operand(id, 1)) ? signLevel : static_cast<Level>(spelling.level + 1));
         later(spelling.text);
-        later(store_.operand(id, 0), spelling.level);
+        later(store_.operand(id, 0), spelling.level, op == SymbolicOp::Power);
     }
 
-    // The operand behind a prefix: two signs in a row would read as another operator, and -3 as a negative number.
+    bool isNumber(NodeId id) const {
+        return store_.op(id) == SymbolicOp::IntValue || store_.op(id) == SymbolicOp::DoubleValue;
+    }
+    bool isNegativeNumber(NodeId id) const {
+        return isNumber(id) &&
+               (store_.op(id) == SymbolicOp::IntValue ? store_.intValue(id) < 0 : store_.doubleValue(id) < 0);
+    }
+    // What can be an exponent without parentheses, where no power follows that its sign would take in. 2^(-a^b) keeps
+    // them, for not everybody reads 2^-a^b the same.
+    bool isSignedOperand(NodeId id) const {
+        if (isNegativeNumber(id)) return true;
+        const NodeId outermost = id;
+        while (store_.op(id) == SymbolicOp::UnaryMinus || store_.op(id) == SymbolicOp::Not)
+            id = store_.operand(id, 0);
+        return id != outermost && store_.op(id) != SymbolicOp::Power;
+    }
+
+    // The operand behind a prefix: -3 would read as a negative number, and two signs in a row as another operator of C.
     void writeSigned(SymbolicOp op, NodeId operand) {
-        const SymbolicOp inner = store_.op(operand);
-        const bool isNumber = inner == SymbolicOp::IntValue || inner == SymbolicOp::DoubleValue;
-        if (op == SymbolicOp::UnaryMinus && isNumber) {
+        const bool mayFollow = op == SymbolicOp::Not || store_.op(operand) == SymbolicOp::Not || hostOperators_;
+        if (op == SymbolicOp::UnaryMinus && isNumber(operand) && !(mayFollow && isNegativeNumber(operand))) {
             later(")");
             later(operand, orLevel);
             later("(");
         } else {
-            later(operand, op == SymbolicOp::UnaryMinus ? powerLevel : signLevel);
+            later(operand, mayFollow ? signLevel : powerLevel);
         }
     }
 

@@ -10,11 +10,6 @@
 #include "qltypes/host/Assert_internal.h"
 
 namespace QLTypeSys {
-namespace {
-
-bool isList(const QL::SymbolicExpr& expr) { return expr.getOp() == QL::SymbolicOp::ND; }
-
-} // namespace
 
 QL::SymbolicExpr SymbolicDims::expr() const { return table_->getSymbolicExpr(exprIdOf(id_)); }
 
@@ -24,7 +19,7 @@ std::size_t SymbolicDims::getNumDimensions() const { return std::max<std::size_t
 
 int SymbolicDims::getDimensionId(std::size_t index) const {
     const QL::SymbolicExpr own = expr();
-    if (!isList(own)) return id_;
+    if (own.getNumDimensions() == 0) return id_;
     QLTYPES_ASSERT(index < own.getNumDimensions());
     return symbolicIdOf(own.getDimension(index));
 }
@@ -94,7 +89,7 @@ int listOf(SymbolicDimsTable& table, const std::vector<int>& ids) {
     std::vector<unsigned long> exprIds;
     exprIds.reserve(ids.size());
     for (const int id : ids) {
-        QLTYPES_ASSERT(!isList(table.getSymbolicExpr(exprIdOf(id))));
+        QLTYPES_ASSERT(table.getSymbolicExpr(exprIdOf(id)).getOp() != QL::SymbolicOp::ND);
         exprIds.push_back(exprIdOf(id));
     }
     QL::SymbolicExprTable& exprs = table.getExprTable();

@@ -39,10 +39,10 @@ class QL_EXPORT SymbolicDims {
     /// Whether it has no operands: a symbol or a number.
     bool isTerminal() const;
 
-    /// Number of dimensions; 1 for what is no list.
+    /// Number of dimensions; 1 for what is no list, and for a list of none.
     std::size_t getNumDimensions() const;
 
-    /// The id of a dimension of a list. For what is no list, its own id whatever the index.
+    /// The id of a dimension of a list. For what is no list or a list of none, its own id whatever the index.
     /// Unchecked: `index` must be below getNumDimensions() of a list.
     int getDimensionId(std::size_t index) const;
     /// The handle of getDimensionId(index).

@@ -274,6 +274,22 @@ TEST_F(SymbolicDimsTableTest, Collapse) {
     EXPECT_EQ(table.collapseDimensions(list({k}), 7), one); // whatever the index
 }
 
+TEST_F(SymbolicDimsTableTest, AListOfNoDimensionsCountsAsOne) {
+    const int none = list({});
+    EXPECT_EQ(table.getSymbolicDims(none).getNumDimensions(), 1u);
+    EXPECT_EQ(table.getSymbolicDims(none).getDimensionId(0), none);
+    EXPECT_EQ(table.removeTrailingOnes(none, 1), none);
+    EXPECT_EQ(table.removeLeadingOnes(none), none);
+    EXPECT_EQ(table.collapseDimensions(none, 0), one);
+    EXPECT_EQ(table.amendSymbolicDims(none, {4, 1}), list({one, one}));
+    EXPECT_EQ(table.getWidthSymbolicDimsId(none), none);
+    std::vector<std::string> texts;
+    table.getSymbolicDimensions(none, texts);
+    EXPECT_EQ(texts, std::vector<std::string>{"[]"});
+    table.addEqualRelation(none, k, nullptr);
+    EXPECT_TRUE(table.hasEqualRelation(none, k));
+}
+
 TEST_F(SymbolicDimsTableTest, Amend) {
     table.registerValue("K", 4);
     table.registerValue("L", 5);

@@ -153,6 +153,15 @@ TEST_F(SymbolicSimplify, Modulo) {
         {(k % n(4)) % n(3), "K % 4 % 3"},
         {f(SymbolicOp::Rem, k, l), "K % L"},
         {f(SymbolicOp::Mod, -k, -l), "-mod(K, L)"},
+        {f(SymbolicOp::Mod, k + n(3) * l, l), "mod(K, L)"},
+        {f(SymbolicOp::Mod, k * l * l - n(2) * k + l, l), "mod(-2*K, L)"},
+        {f(SymbolicOp::Mod, k + n(5), n(4)), "mod(K + 1, 4)"},
+        {f(SymbolicOp::Mod, k - n(5), n(4)), "mod(K - 1, 4)"},
+        {f(SymbolicOp::Mod, n(6) * k + n(7) * l, n(4)), "mod(2*K + 3*L, 4)"},
+        {f(SymbolicOp::Mod, r + l, l), "mod(R/2, L)"},
+        {f(SymbolicOp::Mod, f(SymbolicOp::Mod, k, l) + l, l), "mod(K, L)"},
+        {f(SymbolicOp::Mod, k + l, k / l), "mod(K + L, K/L)"},
+        {(k + l) % l, "(K + L) % L"}, // 2 - 3 and 2 differ in sign
         {k % l + k % l, "2*(K % L)"},
         {r % n(1), "R/2 % 1"}, // R/2 need not be whole
     });
@@ -160,6 +169,7 @@ TEST_F(SymbolicSimplify, Modulo) {
     const E x = symbol(numbers, "x");
     EXPECT_EQ(text(simplified(x % number(numbers, 1))), "x % 1");
     EXPECT_EQ(text(simplified(make(SymbolicOp::Floor, x))), "floor(x)");
+    EXPECT_EQ(text(simplified(make(SymbolicOp::Mod, x * x + number(numbers, 3) * x, x))), "mod(x*x, x)");
     EXPECT_EQ(text(simplified((number(numbers, 3) * x) % x)), "0");
 }
 
@@ -558,6 +568,8 @@ TEST_F(SymbolicLarge, PartsOfWhatIsBeyondTheBoundsHaveTheirOwnForms) {
     for (const E& tooLarge : {two * a * b, minusOne * k * a * b, k * a * b, a * b + k * a * b})
         EXPECT_EQ(simplified(simplified(tooLarge) - tooLarge).id, table.addInt(0));
     simplified(make(SymbolicOp::Power, c, number(table, 3)));
+    EXPECT_EQ(simplified(two * k * a * b / b).id, simplified(two * k * a).id);
+    EXPECT_EQ(simplified(k / (a * b) * b).id, simplified(k / a).id);
     EXPECT_EQ(simplified(two * a).id, simplified(a + a).id);
     EXPECT_EQ(simplified(minusOne * k).id, simplified(-k).id);
     EXPECT_EQ(simplified(k * a).id, simplified(a * k).id);
