@@ -79,7 +79,7 @@ NodeId Simplifier::withTerm(NodeId sum, SymbolicOp op, NodeId term) {
         return p.coefficient.sign() > 0 && !p.hasDoubles && !p.hasQuotients;
     };
     const ExprReader::Product added = reader_.simplifiedTerm(term);
-    if (isSum(store_.op(term)) || !isPlain(added)) return noNode;
+    if (isSum(store_.op(term)) || store_.op(term) == SymbolicOp::DoubleValue || !isPlain(added)) return noNode;
     const auto orderOf = [&](const ExprReader::Product& other) {
         return Polynomial::compareMonomials(Polynomial::degreeOf(other.atoms()), other.atoms(),
                                             Polynomial::degreeOf(added.atoms()), added.atoms());

@@ -424,6 +424,7 @@ TEST(SymbolicCanonical, SumsOfHandlesHaveTheFormOfTheWholeSum) {
         const auto anyTerm = [&] {
             const int value = static_cast<int>(random() % 9) - 4;
             E term = random() % 8 == 0 ? number(table, 0.25) : number(table, value);
+            if (random() % 16 == 0) term = number(table, 2.0);
             if (random() % 16 == 0) term = number(table, 2'147'483'647) * number(table, 2'147'483'645);
             for (auto i = random() % 4; i-- > 0;)
                 term = term * symbols[random() % symbols.size()];
