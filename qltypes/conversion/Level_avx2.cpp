@@ -324,16 +324,24 @@ struct Avx2 {
             return wrapped<D, rounding>(S{}, conversion::floating(S{}, v));
     }
 
+    template <class S, class D, fxpModeOverflow_tag overflow> static constexpr std::size_t together = 0;
+
     template <class F, class D> using FloatingLosses = LossesBackAndForth<F, D>;
-    template <class S> static __m256i unlikeSingle(S, __m256i v) {
+    template <class S, class D> static constexpr bool narrowsLater = false;
+    template <class S, class D, std::size_t times> static void storeKept(std::byte* dst, const auto(&kept)[times]) {
+        constexpr std::size_t bytes = registerBytes * sizeof(D) / std::max(sizeof(S), sizeof(D));
+        for (std::size_t k = 0; k < times; ++k)
+            store<bytes>(dst + k * bytes, kept[k]);
+    }
+    template <class S> static __m256i withUnlikeSingle(__m256i found, S, __m256i v) {
         // 2^31, next to the highest, comes back as the lowest. From 2^31 on a single has all bits but the lowest eight.
         const __m256i differences = v ^ _mm256_cvttps_epi32(_mm256_cvtepi32_ps(v));
         if constexpr (std::is_signed_v<S>)
-            return differences;
+            return found | differences;
         else
-            return _mm256_castps_si256(_mm256_blendv_ps(_mm256_castsi256_ps(differences),
-                                                        _mm256_castsi256_ps(v & _mm256_set1_epi32(0xff)),
-                                                        _mm256_castsi256_ps(v)));
+            return found | _mm256_castps_si256(_mm256_blendv_ps(_mm256_castsi256_ps(differences),
+                                                                _mm256_castsi256_ps(v & _mm256_set1_epi32(0xff)),
+                                                                _mm256_castsi256_ps(v)));
     }
 
     static auto floating(auto f, __m256i bits) { return conversion::floating(f, bits); }

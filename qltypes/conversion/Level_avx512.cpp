@@ -40,8 +40,14 @@ constexpr int directionOf = (rounding == FXP_ROUND_CEILING                      
 constexpr int towardZero = directionOf<FXP_ROUND_ZERO>;
 constexpr int toNearest = directionOf<FXP_ROUND_HALF_EVEN>;
 
-// (a & b) | c of three registers.
+// (a & b) | c, and a | (b ^ c), of three registers.
 constexpr int andOr = 0xea;
+constexpr int orDifferent = 0xf6;
+
+// Notes in which bits two registers differ.
+inline __m512i withDifferences(__m512i found, __m512i a, __m512i b) {
+    return _mm512_ternarylogic_epi64(found, a, b, orDifferent);
+}
 
 inline __m512d halfWithSignOf(__m512d v) {
     return _mm512_castsi512_pd(_mm512_ternarylogic_epi64(_mm512_castpd_si512(v), _mm512_castpd_si512(all(-0.0)),
@@ -121,16 +127,17 @@ template <int from, int to> auto saturatedUnsigned(__m512i v) {
     else                                     return _mm512_cvtusepi16_epi8(v);
 }
 
-// Elements of an integer type to integers of `to` bytes, eight of them or a full register.
-template <class S, int to, int lanes> auto widened(auto v) {
+// Elements of an integer type to a full register of integers of `to` bytes.
+template <class S, int to> __m512i widened(auto v) {
     constexpr bool isSigned = std::is_signed_v<S>;
-    if constexpr (sizeof(S) == to)                return v;
+    if constexpr (sizeof(S) == to)                  return v;
     else if constexpr (to == 2 && isSigned)         return _mm512_cvtepi8_epi16(v);
     else if constexpr (to == 2)                     return _mm512_cvtepu8_epi16(v);
-    else if constexpr (lanes == 16 && sizeof(S) == 1) return isSigned ? _mm512_cvtepi8_epi32(v) : _mm512_cvtepu8_epi32(v);
-    else if constexpr (lanes == 16)                 return isSigned ? _mm512_cvtepi16_epi32(v) : _mm512_cvtepu16_epi32(v);
-    else if constexpr (sizeof(S) == 1)              return isSigned ? _mm256_cvtepi8_epi32(v) : _mm256_cvtepu8_epi32(v);
-    else                                          return isSigned ? _mm256_cvtepi16_epi32(v) : _mm256_cvtepu16_epi32(v);
+    else if constexpr (to == 4 && sizeof(S) == 1)   return isSigned ? _mm512_cvtepi8_epi32(v) : _mm512_cvtepu8_epi32(v);
+    else if constexpr (to == 4)                     return isSigned ? _mm512_cvtepi16_epi32(v) : _mm512_cvtepu16_epi32(v);
+    else if constexpr (sizeof(S) == 1)              return isSigned ? _mm512_cvtepi8_epi64(v) : _mm512_cvtepu8_epi64(v);
+    else if constexpr (sizeof(S) == 2)              return isSigned ? _mm512_cvtepi16_epi64(v) : _mm512_cvtepu16_epi64(v);
+    else                                            return isSigned ? _mm512_cvtepi32_epi64(v) : _mm512_cvtepu32_epi64(v);
 }
 
 // Lanes of `size` bytes.
@@ -150,6 +157,14 @@ template <int size> __m512i leastUnsigned(__m512i a, __m512i b) {
     else                          return _mm512_min_epu8(a, b);
 }
 // clang-format on
+
+// The lanes of a mask that are not the lowest integer.
+inline __mmask8 unlikeLowest(__mmask8 lanes, __m512i v, double) {
+    return _mm512_mask_cmpneq_epi64_mask(lanes, v, _mm512_set1_epi64(INT64_MIN));
+}
+inline __mmask16 unlikeLowest(__mmask16 lanes, __m512i v, float) {
+    return _mm512_mask_cmpneq_epi32_mask(lanes, v, _mm512_set1_epi32(INT32_MIN));
+}
 
 template <class D, fxpModeRounding_tag rounding, class F> auto saturated(F, auto v) {
     constexpr int direction = directionOf<rounding>;
@@ -200,18 +215,17 @@ template <class S, class D> auto toFloating(auto v) {
     else if constexpr (std::is_same_v<S, float>)
         return _mm512_castpd_si512(_mm512_cvtps_pd(_mm256_castsi256_ps(v)));
     else if constexpr (std::is_same_v<D, double>)
-        return _mm512_castpd_si512(std::is_same_v<S, std::uint32_t> ? _mm512_cvtepu32_pd(widened<S, 4, 8>(v))
-                                                                    : _mm512_cvtepi32_pd(widened<S, 4, 8>(v)));
+        return _mm512_castpd_si512(_mm512_cvtepi64_pd(widened<S, 8>(v)));
     else
-        return _mm512_castps_si512(std::is_same_v<S, std::uint32_t> ? _mm512_cvtepu32_ps(widened<S, 4, 16>(v))
-                                                                    : _mm512_cvtepi32_ps(widened<S, 4, 16>(v)));
+        return _mm512_castps_si512(std::is_same_v<S, std::uint32_t> ? _mm512_cvtepu32_ps(widened<S, 4>(v))
+                                                                    : _mm512_cvtepi32_ps(widened<S, 4>(v)));
 }
 
 template <class S, class D, fxpModeOverflow_tag overflow> auto toInteger(auto v) {
     constexpr bool saturates = overflowMatters<S, D> && overflow == FXP_OVERFLOW_SATURATE;
     constexpr int from = sizeof(S), to = sizeof(D);
     if constexpr (to > from) {
-        const __m512i wide = widened<S, to, 64 / to>(v);
+        const __m512i wide = widened<S, to>(v);
         if constexpr (saturates)
             return mostSigned<to>(wide, __m512i{});
         else
@@ -229,7 +243,78 @@ template <class S, class D, fxpModeOverflow_tag overflow> auto toInteger(auto v)
     }
 }
 
-// Losses of floating elements. convert() gives what D has of them, and something else where it has not.
+// Narrowing one register takes two shuffles. Where several fill one together they share them: one a register.
+
+// Whether registers of S are narrowed together to D.
+template <class S, class D>
+constexpr bool narrowsTogether = sizeof(D) < sizeof(S) && !isFloating<D> && !(isFloating<S> && isBoolean<D>);
+
+// The numbers in the lanes either saturate when they are packed, to a signed or an unsigned range, or are cut off.
+enum class Packing { toSigned, toUnsigned, cutOff };
+
+inline __m512i lowerHalves(__m512i a, __m512i b) {
+    return _mm512_permutex2var_epi32(a, _mm512_setr_epi32(0, 2, 4, 6, 8, 10, 12, 14, 16, 18, 20, 22, 24, 26, 28, 30),
+                                     b);
+}
+
+// As many registers of lanes of `from` bytes as fill one of `to`. Numbers of 8 bytes are within 4, or are cut off. What
+// packs two registers takes a quarter of each in turn: the quarters are put in order at the end.
+template <int from, int to, Packing packing> __m512i packed(const __m512i* v) {
+    if constexpr (from == 8) {
+        __m512i halves[4 / to];
+        for (int i = 0; i < 4 / to; ++i)
+            halves[i] = lowerHalves(v[2 * i], v[2 * i + 1]);
+        return packed<4, to, packing>(halves);
+    } else if constexpr (from == to) {
+        return v[0];
+    } else {
+        constexpr int parts = from / to;
+        __m512i numbers[parts];
+        for (int i = 0; i < parts; ++i)
+            numbers[i] = packing == Packing::cutOff ? v[i] & allLanes<from>((1u << 8 * to) - 1) : v[i];
+        constexpr bool isSigned = packing == Packing::toSigned;
+        const auto pack16 = [](__m512i a, __m512i b) {
+            return isSigned ? _mm512_packs_epi16(a, b) : _mm512_packus_epi16(a, b);
+        };
+        if constexpr (parts == 4) {
+            const __m512i all =
+                pack16(_mm512_packs_epi32(numbers[0], numbers[1]), _mm512_packs_epi32(numbers[2], numbers[3]));
+            return _mm512_permutexvar_epi32(_mm512_setr_epi32(0, 4, 8, 12, 1, 5, 9, 13, 2, 6, 10, 14, 3, 7, 11, 15),
+                                            all);
+        } else {
+            const auto pack32 = isSigned ? _mm512_packs_epi32 : _mm512_packus_epi32;
+            const __m512i all = from == 2 ? pack16(numbers[0], numbers[1]) : pack32(numbers[0], numbers[1]);
+            return _mm512_permutexvar_epi64(_mm512_setr_epi64(0, 2, 4, 6, 1, 3, 5, 7), all);
+        }
+    }
+}
+
+template <int from, int to, Packing packing, std::size_t times>
+void storePacked(std::byte* dst, const __m512i (&v)[times]) {
+    for (std::size_t k = 0; k < times; k += from / to, dst += sizeof(__m512i))
+        _mm512_storeu_si512(dst, packed<from, to, packing>(v + k));
+}
+
+template <class D> constexpr Packing saturatingTo = std::is_signed_v<D> ? Packing::toSigned : Packing::toUnsigned;
+
+// Whole numbers that saturate to D when they are packed.
+template <class D, fxpModeRounding_tag rounding, class F> __m512i forPacking(F, auto v) {
+    constexpr int direction = directionOf<rounding>;
+    using Within = std::conditional_t<std::is_same_v<D, std::uint32_t>, std::uint32_t, std::int32_t>;
+    if constexpr (std::is_same_v<F, float> && std::is_signed_v<D>) {
+        // What is below 32 bits converts to the lowest number.
+        return maskedToSigned<direction>(v, withHalf<F, rounding>(least(v, all(0x1p30F))));
+    } else if constexpr (std::is_same_v<F, float>) {
+        return toSigned<direction>(withHalf<F, rounding>(least(most(v, all(0.0F)), all(0x1p30F))));
+    } else {
+        const auto atLeast = std::is_signed_v<D> ? most(all(double{lowest<Within>}), v) : most(v, all(0.0));
+        // NaN converts to the lowest number of 64 bits: its lower half is zero.
+        return toSigned<direction>(withHalf<F, rounding>(least(all(double{highest<Within>}), atLeast)));
+    }
+}
+
+// Losses of floating elements. convert() gives what D has of them, and something else where it has not; numbers that
+// are narrowed later are as wide as before.
 
 // To narrower integers and boolean: rounding down and rounding up differ, or, once the range begins at zero, a bit is
 // set that no number of it has. What does not convert is the lowest integer in both directions, and outside.
@@ -239,9 +324,9 @@ template <class F, class D> class LossesToNarrower {
         const auto v = floating(F{}, bits);
         const __m512i down = toSigned<directionOf<FXP_ROUND_FLOOR>>(v);
         const __m512i up = toSigned<directionOf<FXP_ROUND_CEILING>>(v);
-        differences_ |= down ^ up;
+        differences_ = withDifferences(differences_, down, up);
         bits_ |= plus(down, belowZero);
-        return cut<sizeof(F), sizeof(D)>(down);
+        return down;
     }
     bool anyLost() const {
         const __m512i lost = differences_ | _mm512_andnot_si512(plus(__m512i{}, belowZero + highestOf()), bits_);
@@ -266,24 +351,27 @@ template <class F, class D> class LossesToNarrower {
     __m512i bits_{};
 };
 
-// To single and back. NaN may come back as it was, but shows itself by its magnitude.
+// To single and back. NaN may come back as it was; it is looked for in pairs of results.
 class LossesToSingle {
   public:
     __m256i convert(__m512i bits) {
         const __m256 d = _mm512_cvtpd_ps(floating(double{}, bits));
-        differences_ |= bits ^ _mm512_castpd_si512(_mm512_cvtps_pd(d));
-        magnitudes_ = _mm512_max_epu64(magnitudes_, _mm512_add_epi64(bits, bits)); // the signs pushed out
+        differences_ = withDifferences(differences_, bits, _mm512_castpd_si512(_mm512_cvtps_pd(d)));
+        if (isSecond_) nans_ = _kor_mask8(nans_, _mm256_cmp_ps_mask(first_, d, _CMP_UNORD_Q));
+        first_ = d;
+        isSecond_ = !isSecond_;
         return _mm256_castps_si256(d);
     }
     bool anyLost() const {
-        const __m512i infinity = _mm512_castpd_si512(all(__builtin_inf()));
-        return (_mm512_test_epi64_mask(differences_, differences_) |
-                _mm512_cmpgt_epu64_mask(magnitudes_, _mm512_add_epi64(infinity, infinity))) != 0;
+        const __mmask8 nans = _kor_mask8(nans_, _mm256_cmp_ps_mask(first_, first_, _CMP_UNORD_Q));
+        return (_mm512_test_epi64_mask(differences_, differences_) | nans) != 0;
     }
 
   private:
     __m512i differences_{};
-    __m512i magnitudes_{};
+    __mmask8 nans_ = 0;
+    __m256 first_{};
+    bool isSecond_ = false;
 };
 
 // Singles to 32-bit integers and back, toward zero, so that no end of a range comes back as a power of two.
@@ -320,7 +408,7 @@ struct Avx512 {
         if constexpr (bytes == 64)      return _mm512_loadu_si512(p);
         else if constexpr (bytes == 32) return _mm256_loadu_si256(reinterpret_cast<const __m256i_u*>(p));
         else if constexpr (bytes == 16) return _mm_loadu_si128(reinterpret_cast<const __m128i_u*>(p));
-        else                            return _mm_loadu_si64(p);
+        else                            return _mm_loadl_epi64(reinterpret_cast<const __m128i_u*>(p));
     }
     template <std::size_t bytes> static auto load(const std::byte* p, std::size_t used) {
         const __mmask64 mask = firstBytes(used);
@@ -332,7 +420,7 @@ struct Avx512 {
         if constexpr (bytes == 64)      _mm512_storeu_si512(p, v);
         else if constexpr (bytes == 32) _mm256_storeu_si256(reinterpret_cast<__m256i_u*>(p), v);
         else if constexpr (bytes == 16) _mm_storeu_si128(reinterpret_cast<__m128i_u*>(p), v);
-        else                            _mm_storeu_si64(p, v);
+        else                            _mm_storel_pi(reinterpret_cast<__m64*>(p), _mm_castsi128_ps(v));
     }
     template <std::size_t bytes> static void store(std::byte* p, auto v, std::size_t used) {
         const __mmask64 mask = firstBytes(used);
@@ -356,12 +444,74 @@ struct Avx512 {
             return wrapped<D, rounding>(S{}, floating(S{}, v));
     }
 
+    // Wrapping numbers of the element's own size are taken together for another reason: most convert without the
+    // division that they may need, and four are looked at at once.
+    template <class S, class D, fxpModeOverflow_tag overflow>
+    static constexpr std::size_t together = narrowsTogether<S, D> ? std::max<std::size_t>(4, sizeof(S) / sizeof(D))
+                                            : roundingMatters<S, D>&& overflow == FXP_OVERFLOW_WRAP ? 4
+                                                                                                    : 0;
+
+    template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
+    static void convertTogether(const std::byte* src, std::byte* dst) {
+        constexpr std::size_t times = together<S, D, overflow>;
+        constexpr bool wraps = overflow == FXP_OVERFLOW_WRAP;
+        __m512i numbers[times];
+        for (std::size_t k = 0; k < times; ++k)
+            numbers[k] = load<registerBytes>(src + k * registerBytes);
+        if constexpr (isBoolean<D>) {
+            for (__m512i& each : numbers)
+                each = leastUnsigned<sizeof(S)>(each, allLanes<sizeof(S)>(1));
+            storePacked<sizeof(S), sizeof(D), Packing::toUnsigned>(dst, numbers);
+        } else if constexpr (isInteger<S>) {
+            constexpr bool saturates = overflowMatters<S, D> && !wraps;
+            if constexpr (saturates && std::is_unsigned_v<S>)
+                for (__m512i& each : numbers)
+                    each = leastUnsigned<sizeof(S)>(each, allLanes<sizeof(S)>(highest<D>));
+            storePacked<sizeof(S), sizeof(D), saturates ? saturatingTo<D> : Packing::cutOff>(dst, numbers);
+        } else if constexpr (wraps) {
+            // What converts to the lowest integer may not have converted at all. Its lowest byte is right even so.
+            constexpr int direction = directionOf<rounding>;
+            using Lanes = decltype(lanesWhere<_CMP_EQ_OQ>(floating(S{}, numbers[0]), S{}));
+            constexpr auto everyLane = static_cast<Lanes>(-1);
+            Lanes didConvert = everyLane;
+            for (__m512i& each : numbers) {
+                each = toSigned<direction>(withHalf<S, rounding>(floating(S{}, each)));
+                if constexpr (sizeof(D) > 1) didConvert = unlikeLowest(didConvert, each, S{});
+            }
+            if (didConvert != everyLane) [[unlikely]] {
+                constexpr std::size_t bytes = registerBytes * sizeof(D) / sizeof(S);
+                for (std::size_t k = 0; k < times; ++k)
+                    store<bytes>(dst + k * bytes,
+                                 converted<S, D, rounding, overflow>(load<registerBytes>(src + k * registerBytes)));
+                return;
+            }
+            storePacked<sizeof(S), sizeof(D), Packing::cutOff>(dst, numbers);
+        } else {
+            for (__m512i& each : numbers)
+                each = forPacking<D, rounding>(S{}, floating(S{}, each));
+            storePacked<sizeof(S), sizeof(D), saturatingTo<D>>(dst, numbers);
+        }
+    }
+
     template <class F, class D> using FloatingLosses = typename LossesOf<F, D>::type;
-    template <class S> static __m512i unlikeSingle(S, __m512i v) {
+    template <class S, class D> static constexpr bool narrowsLater = narrowsTogether<S, D>;
+    template <class S, class D, std::size_t times> static void storeKept(std::byte* dst, const auto(&kept)[times]) {
+        if constexpr (sizeof(D) >= sizeof(S) || isFloating<D>) {
+            for (std::size_t k = 0; k < times; ++k)
+                store<sizeof kept[k]>(dst + k * sizeof kept[k], kept[k]);
+        } else if constexpr (times >= sizeof(S) / sizeof(D)) {
+            storePacked<sizeof(S), sizeof(D), saturatingTo<D>>(dst, kept);
+        } else {
+            constexpr std::size_t bytes = registerBytes * sizeof(D) / sizeof(S);
+            for (std::size_t k = 0; k < times; ++k)
+                store<bytes>(dst + k * bytes, cut<sizeof(S), sizeof(D)>(kept[k]));
+        }
+    }
+    template <class S> static __m512i withUnlikeSingle(__m512i found, S, __m512i v) {
         if constexpr (std::is_signed_v<S>) // 2^31, next to the highest, comes back as the lowest
-            return v ^ _mm512_cvttps_epi32(_mm512_cvtepi32_ps(v));
+            return withDifferences(found, v, _mm512_cvttps_epi32(_mm512_cvtepi32_ps(v)));
         else // rounded toward zero, or 2^32 would come back as the highest
-            return v ^ _mm512_cvttps_epu32(_mm512_cvt_roundepu32_ps(v, towardZero));
+            return withDifferences(found, v, _mm512_cvttps_epu32(_mm512_cvt_roundepu32_ps(v, towardZero)));
     }
 
     static auto floating(auto f, __m512i bits) { return conversion::floating(f, bits); }

@@ -7,14 +7,17 @@
 //   load<bytes>(p), load<bytes>(p, used)         a register of `bytes`; the second reads `used`, the rest is zero
 //   store<bytes>(p, v), store<bytes>(p, v, used)
 //   converted<S, D, rounding, overflow>(v)       elements of S to as many elements of D
+//   together<S, D, overflow>                     how many registers convertTogether takes, or 0 where it is not there
+//   convertTogether<S, D, rounding, overflow>(src, dst)      the same as converted for each of them
 //   FloatingLosses<F, D>                         convert(v) does, right where D has the value; anyLost() of all so far
-//   unlikeSingle(S{}, v)                         bits that differ once 32-bit integers have been singles
-//   floating(F{}, v), magnitude(v)               a whole register as floating elements
-//   lanesWhere<relation>(v, bound)               a mask; masks combine with & and |, any(mask) asks
-//   plus<size>(v, amount), anyBit<size>(v, some) the sum by lanes; whether a lane has one of some bits
-//   doubled32(v), most32(v, w)                   of unsigned 32-bit lanes: twice the lane cut off, the larger lanes
-//   anyFrom32(v, low, high)                      whether an even lane is at least `low` or an odd one at least `high`
-//   copyToMemory(src, dst, bytes), finishCopies()     as in Level
+//   narrowsLater<S, D>                           storeKept takes integers as they were, not what they convert to
+//   storeKept<S, D>(p, results)                  stores what FloatingLosses or integers without losses have become
+//   withUnlikeSingle(found, S{}, v)              `found`, and the bits that differ once 32-bit integers have been
+//   singles floating(F{}, v), magnitude(v)               a whole register as floating elements lanesWhere<relation>(v,
+//   bound)               a mask; masks combine with & and |, any(mask) asks plus<size>(v, amount), anyBit<size>(v,
+//   some) the sum by lanes; whether a lane has one of some bits doubled32(v), most32(v, w)                   of
+//   unsigned 32-bit lanes: twice the lane cut off, the larger lanes anyFrom32(v, low, high) whether an even lane is at
+//   least `low` or an odd one at least `high` copyToMemory(src, dst, bytes), finishCopies()     as in Level
 //
 // The bits of a register that stand for no element of a run are zero, which is lost nowhere and overflows nothing.
 #pragma once
@@ -74,11 +77,27 @@ template <class Vectors, class S, class D> class IntegersOutside {
 /// 32-bit integers that a single does not hold.
 template <class Vectors, class S> class IntegersUnlikeSingles {
   public:
-    void note(typename Vectors::Bits v) { differences_ |= Vectors::unlikeSingle(S{}, v); }
+    void note(typename Vectors::Bits v) { differences_ = Vectors::withUnlikeSingle(differences_, S{}, v); }
     bool any() const { return Vectors::template anyBit<4>(differences_, ~std::uint32_t{0}); }
 
   private:
     typename Vectors::Bits differences_{};
+};
+
+/// A quick look before: what needs no more bits than a single has is held. What any() affirms may be held too.
+template <class Vectors, class S> class PerhapsUnlikeSingles {
+  public:
+    void note(typename Vectors::Bits v) {
+        if constexpr (std::is_signed_v<S>)
+            found_ |= Vectors::template plus<4>(v, held);
+        else
+            found_ |= v;
+    }
+    bool any() const { return Vectors::template anyBit<4>(found_, ~((held << std::is_signed_v<S>)-1)); }
+
+  private:
+    static constexpr std::uint32_t held = std::uint32_t{1} << std::numeric_limits<float>::digits;
+    typename Vectors::Bits found_{};
 };
 
 /// Floating elements beyond the bounds of the overflow test.
@@ -139,18 +158,24 @@ template <class Vectors, class F, class D, fxpModeRounding_tag rounding> class P
     typename Vectors::Bits most_{};
 };
 
-/// Converts registers of integers and notes whether an element is lost.
+/// Converts registers of integers and notes whether an element is lost; toward single, whether one may be.
 template <class Vectors, class S, class D> class IntegerLosses {
   public:
     auto convert(auto v) {
         using Bits = SameBits<S, D, FXP_OVERFLOW_WRAP>;
-        const auto result =
-            Vectors::template converted<typename Bits::Src, typename Bits::Dst, FXP_ROUND_ZERO, FXP_OVERFLOW_WRAP>(v);
-        if constexpr (sizeof(D) > sizeof(S))
-            notes_.note(result);
-        else
+        if constexpr (Vectors::template narrowsLater<S, D>) {
             notes_.note(v);
-        return result;
+            return v;
+        } else {
+            const auto result =
+                Vectors::template converted<typename Bits::Src, typename Bits::Dst, FXP_ROUND_ZERO, FXP_OVERFLOW_WRAP>(
+                    v);
+            if constexpr (sizeof(D) > sizeof(S))
+                notes_.note(result);
+            else
+                notes_.note(v);
+            return result;
+        }
     }
     bool anyLost() const { return notes_.any(); }
 
@@ -158,7 +183,7 @@ template <class Vectors, class S, class D> class IntegerLosses {
     // Where integers are widened, what is looked at is the result: only negative numbers are lost there.
     using LookedAt =
         typename std::conditional_t<(sizeof(D) > sizeof(S)), std::make_signed<D>, std::type_identity<S>>::type;
-    std::conditional_t<isFloating<D>, IntegersUnlikeSingles<Vectors, S>, IntegersOutside<Vectors, LookedAt, D>> notes_;
+    std::conditional_t<isFloating<D>, PerhapsUnlikeSingles<Vectors, S>, IntegersOutside<Vectors, LookedAt, D>> notes_;
 };
 
 template <class Vectors> struct VectorRuns {
@@ -205,44 +230,82 @@ template <class Vectors> struct VectorRuns {
         (std::make_index_sequence<times>());
     }
 
+    template <class S, class D> struct RegisterBytes {
+        static constexpr std::size_t src = lanes<S, D> * sizeof(S), dst = lanes<S, D> * sizeof(D);
+    };
+
+    template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
+    static void convertRegister(const std::byte* src, std::byte* dst) {
+        using Bytes = RegisterBytes<S, D>;
+        Vectors::template store<Bytes::dst>(
+            dst, Vectors::template converted<S, D, rounding, overflow>(Vectors::template load<Bytes::src>(src)));
+    }
+
+    template <class S, class D, fxpModeOverflow_tag overflow>
+    static constexpr std::size_t registersPerStep =
+        Vectors::template together<S, D, overflow> ? Vectors::template together<S, D, overflow> : 4;
+
+    // What a short vector does not need stands in another function: this one does without a frame.
     template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
     static bool convertRegisters(const std::byte* src, std::byte* dst, std::size_t count) {
-        constexpr std::size_t perRegister = lanes<S, D>, unrolled = 4;
-        constexpr std::size_t srcBytes = perRegister * sizeof(S), dstBytes = perRegister * sizeof(D);
-        const auto convertRegister = [&](std::size_t k) {
-            const auto loaded = Vectors::template load<srcBytes>(src + k * srcBytes);
-            Vectors::template store<dstBytes>(dst + k * dstBytes,
-                                              Vectors::template converted<S, D, rounding, overflow>(loaded));
-        };
-        for (; count >= unrolled * perRegister; count -= unrolled * perRegister) {
-            repeat<unrolled>(convertRegister);
-            src += unrolled * srcBytes;
-            dst += unrolled * dstBytes;
-        }
-        for (; count >= perRegister; count -= perRegister) {
-            convertRegister(0);
-            src += srcBytes;
-            dst += dstBytes;
-        }
-        if (count) {
-            const auto loaded = Vectors::template load<srcBytes>(src, count * sizeof(S));
-            Vectors::template store<dstBytes>(dst, Vectors::template converted<S, D, rounding, overflow>(loaded),
-                                              count * sizeof(D));
+        constexpr std::size_t perRegister = lanes<S, D>;
+        using Bytes = RegisterBytes<S, D>;
+        if (count >= registersPerStep<S, D, overflow> * perRegister)
+            return convertInSteps<S, D, rounding, overflow>(src, dst, count);
+        const std::byte* const end = src + count * sizeof(S);
+        // Taken apart for the few times that it can run, the loop would be longer.
+#pragma GCC unroll 1
+        for (; src + Bytes::src <= end; src += Bytes::src, dst += Bytes::dst)
+            convertRegister<S, D, rounding, overflow>(src, dst);
+        if (const auto left = static_cast<std::size_t>(end - src)) {
+            const auto loaded = Vectors::template load<Bytes::src>(src, left);
+            Vectors::template store<Bytes::dst>(dst, Vectors::template converted<S, D, rounding, overflow>(loaded),
+                                                left / sizeof(S) * sizeof(D));
         }
         return true;
+    }
+
+    template <class S, class D, fxpModeRounding_tag rounding, fxpModeOverflow_tag overflow>
+    [[gnu::noinline]] static bool convertInSteps(const std::byte* src, std::byte* dst, std::size_t count) {
+        constexpr std::size_t registers = registersPerStep<S, D, overflow>, elements = registers * lanes<S, D>;
+        using Bytes = RegisterBytes<S, D>;
+        for (; count >= elements; count -= elements) {
+            if constexpr (Vectors::template together<S, D, overflow>)
+                Vectors::template convertTogether<S, D, rounding, overflow>(src, dst);
+            else
+                repeat<registers>([&](std::size_t k) {
+                    convertRegister<S, D, rounding, overflow>(src + k * Bytes::src, dst + k * Bytes::dst);
+                });
+            src += registers * Bytes::src;
+            dst += registers * Bytes::dst;
+        }
+        return count == 0 || convertRegisters<S, D, rounding, overflow>(src, dst, count);
     }
 
     // Nothing is written before all that is read is known to be kept: the source may be the destination.
     template <std::size_t times, class S, class D>
     [[gnu::always_inline]] static bool keptRegisters(const std::byte* src, std::byte* dst) {
-        constexpr std::size_t srcBytes = lanes<S, D> * sizeof(S), dstBytes = lanes<S, D> * sizeof(D);
+        constexpr std::size_t srcBytes = RegisterBytes<S, D>::src;
         Losses<S, D> losses;
         decltype(losses.convert(Vectors::template load<srcBytes>(src))) results[times];
         repeat<times>(
             [&](std::size_t k) { results[k] = losses.convert(Vectors::template load<srcBytes>(src + k * srcBytes)); });
-        if (losses.anyLost()) return false;
-        repeat<times>([&](std::size_t k) { Vectors::template store<dstBytes>(dst + k * dstBytes, results[k]); });
+        if (losses.anyLost()) {
+            if constexpr (isInteger<S> && isFloating<D>) {
+                if (!likeSingles<times, S>(src)) return false;
+            } else {
+                return false;
+            }
+        }
+        Vectors::template storeKept<S, D>(dst, results);
         return true;
+    }
+
+    template <std::size_t times, class S> static bool likeSingles(const std::byte* src) {
+        constexpr std::size_t bytes = Vectors::registerBytes;
+        IntegersUnlikeSingles<Vectors, S> notes;
+        repeat<times>([&](std::size_t k) { notes.note(Vectors::template load<bytes>(src + k * bytes)); });
+        return !notes.any();
     }
 
     template <class S, class D>
