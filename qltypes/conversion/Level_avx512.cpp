@@ -136,8 +136,7 @@ template <class S, int to> __m512i widened(auto v) {
     else if constexpr (to == 4 && sizeof(S) == 1)   return isSigned ? _mm512_cvtepi8_epi32(v) : _mm512_cvtepu8_epi32(v);
     else if constexpr (to == 4)                     return isSigned ? _mm512_cvtepi16_epi32(v) : _mm512_cvtepu16_epi32(v);
     else if constexpr (sizeof(S) == 1)              return isSigned ? _mm512_cvtepi8_epi64(v) : _mm512_cvtepu8_epi64(v);
-    else if constexpr (sizeof(S) == 2)              return isSigned ? _mm512_cvtepi16_epi64(v) : _mm512_cvtepu16_epi64(v);
-    else                                            return isSigned ? _mm512_cvtepi32_epi64(v) : _mm512_cvtepu32_epi64(v);
+    else                                            return isSigned ? _mm512_cvtepi16_epi64(v) : _mm512_cvtepu16_epi64(v);
 }
 
 // Lanes of `size` bytes.
@@ -214,6 +213,8 @@ template <class S, class D> auto toFloating(auto v) {
         return _mm256_castps_si256(_mm512_cvtpd_ps(_mm512_castsi512_pd(v)));
     else if constexpr (std::is_same_v<S, float>)
         return _mm512_castpd_si512(_mm512_cvtps_pd(_mm256_castsi256_ps(v)));
+    else if constexpr (std::is_same_v<D, double> && sizeof(S) == 4)
+        return _mm512_castpd_si512(std::is_unsigned_v<S> ? _mm512_cvtepu32_pd(v) : _mm512_cvtepi32_pd(v));
     else if constexpr (std::is_same_v<D, double>)
         return _mm512_castpd_si512(_mm512_cvtepi64_pd(widened<S, 8>(v)));
     else
@@ -282,7 +283,9 @@ template <int from, int to, Packing packing> __m512i packed(const __m512i* v) {
             return _mm512_permutexvar_epi32(_mm512_setr_epi32(0, 4, 8, 12, 1, 5, 9, 13, 2, 6, 10, 14, 3, 7, 11, 15),
                                             all);
         } else {
-            const auto pack32 = isSigned ? _mm512_packs_epi32 : _mm512_packus_epi32;
+            const auto pack32 = [](__m512i a, __m512i b) {
+                return isSigned ? _mm512_packs_epi32(a, b) : _mm512_packus_epi32(a, b);
+            };
             const __m512i all = from == 2 ? pack16(numbers[0], numbers[1]) : pack32(numbers[0], numbers[1]);
             return _mm512_permutexvar_epi64(_mm512_setr_epi64(0, 2, 4, 6, 1, 3, 5, 7), all);
         }

@@ -11,7 +11,7 @@ import sys
 
 source, build, includes = pathlib.Path(sys.argv[1]), pathlib.Path(sys.argv[2]), sys.argv[3:]
 matrix = source / "qltypes/conversion"
-flagsOf = {"Level_avx2": ["-mavx2", "-mfma"], "Level_avx512": ["-mavx512f", "-mavx512bw", "-mavx512dq", "-mavx512vl"]}
+flagsOf = {"Level_avx2": ["-mavx2", "-mfma"], "Level_avx512": ["-mavx512f", "-mavx512bw", "-mavx512dq", "-mavx512vl", "-mprfchw"]}
 sources = [source / "tests/conversion/results_of_all_cells.cpp"]
 sources += [matrix / f"{name}.cpp" for name in ("BuiltInConversion", "Layout", "Levels", "OverflowPrediction")]
 sources += sorted(matrix.glob("Level_*.cpp"))
