@@ -46,6 +46,15 @@ function(qltypes_library_settings target)
   endif()
 endfunction()
 
+# A program that ctest runs as unit.NAME, under QLTYPES_TEST_LAUNCHER where that is set. The target unit_tests builds all.
+function(qltypes_add_unit_test name target)
+  add_test(NAME unit.${name} COMMAND ${QLTYPES_TEST_LAUNCHER} $<TARGET_FILE:${target}>)
+  if(NOT TARGET unit_tests)
+    add_custom_target(unit_tests)
+  endif()
+  add_dependencies(unit_tests ${target})
+endfunction()
+
 # One test executable a folder: qltypes_add_test(types DataType_test.cpp ...).
 # LIBRARIES adds what the folder needs beyond the two libraries and GoogleTest.
 # White-box tests of hidden symbols compile the sources they need into the test with WHITE_BOX.
@@ -57,7 +66,7 @@ function(qltypes_add_test name)
   target_include_directories(test_${name} PRIVATE "${qltypes_SOURCE_DIR}")
   target_compile_definitions(test_${name} PRIVATE QLTYPES_TEST_DATA_DIR="${qltypes_SOURCE_DIR}/tests/data")
   target_link_libraries(test_${name} PRIVATE qltypes::qltypes qltypes::platform ${arg_LIBRARIES} testsupport)
-  add_test(NAME unit.${name} COMMAND test_${name})
+  qltypes_add_unit_test(${name} test_${name})
 endfunction()
 
 # One benchmark program a topic: qltypes_add_bench(types lookup_bench.cpp LIBRARIES ...).

@@ -7,6 +7,7 @@
 #include "qltypes/conversion/BuiltInConversion.h"
 #include "tests/conversion/Reference.h"
 #include "tests/conversion/Support.h"
+#include "tests/support/Rounds.h"
 
 namespace {
 
@@ -73,7 +74,8 @@ TEST(ConversionValues, SpecialValuesOfEveryCell) {
 
 template <class S> void expectRandomPatterns() {
     constexpr std::size_t all = 1 << 20, block = 1 << 14;
-    for (std::uint64_t seed = 1; seed <= all / block && !testing::Test::HasFatalFailure(); ++seed) {
+    for (std::uint64_t seed = 1; seed <= testsupport::rounds(all / block) && !testing::Test::HasFatalFailure();
+         ++seed) {
         SCOPED_TRACE("seed " + std::to_string(seed));
         expectEveryCell(randomValues<S>(block, seed));
     }
@@ -83,7 +85,7 @@ TEST(ConversionValues, AMillionRandomPatternsOfDouble) { expectRandomPatterns<do
 TEST(ConversionValues, AMillionRandomPatternsOfSingle) { expectRandomPatterns<float>(); }
 
 TEST(ConversionValues, RandomNumbersNearTheRanges) {
-    for (std::uint64_t seed = 1; seed <= 8; ++seed) {
+    for (std::uint64_t seed = 1; seed <= testsupport::rounds(8u); ++seed) {
         SCOPED_TRACE("seed " + std::to_string(seed));
         expectEveryCell(randomNumbersInRange<double>(1 << 13, seed));
         expectEveryCell(randomNumbersInRange<float>(1 << 13, seed));

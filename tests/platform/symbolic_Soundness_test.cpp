@@ -6,6 +6,7 @@
 #include "qlplatform/symbolic/SymbolicExprCopy.h"
 #include "qlplatform/symbolic/SymbolicExprFactorDivision.h"
 #include "tests/platform/symbolic_support.h"
+#include "tests/support/Rounds.h"
 
 namespace {
 
@@ -53,6 +54,7 @@ class Soundness : public testing::Test {
 
     // Simplifies one random expression a seed and compares values under some bindings.
     void check(unsigned firstSeed, unsigned numExpressions, const RandomKind& kind, QL::SymbolDomain domain) {
+        numExpressions = testsupport::rounds(numExpressions);
         unsigned numCompared = 0;
         for (unsigned seed = firstSeed; seed < firstSeed + numExpressions; ++seed) {
             if (seed % 1000 == firstSeed % 1000) setUp(domain); // some see a full table, some a new one

@@ -313,6 +313,7 @@ std::size_t bytesInUse() {
 }
 
 TEST(Memory, DoesNotGrowWithTheIndicesAsked) {
+    if (bytesInUse() == 0) GTEST_SKIP() << "the allocator in place of the system's keeps no count";
     Structures s;
     const int inner = s.laidOut("In", {{"a", real}, {"b", real}, {"c", real}});
     const int middle = s.laidOut("Mid", {{"x", real}, {"i", inner, {9}}});

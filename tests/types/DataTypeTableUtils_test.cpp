@@ -306,6 +306,9 @@ TEST_F(FlatTest, Classifiers) {
 
     EXPECT_TRUE(DtIsUFix1(&table, bitAlias));
     EXPECT_FALSE(DtIsUFix1(&table, scaledBit) || DtIsUFix1(&table, 8) || DtIsUFix1(&table, half));
+    for (const char* name : {"ufix2", "sfix2", "ufix1_S1p5", "ufix1_B1"})
+        EXPECT_FALSE(DtIsUFix1(&table, fixpt(name))) << name;
+    EXPECT_FALSE(DtIsUFix1(&table, table.registerDataType("ufix1_B2", dtSourceFixpt, nullptr))) << "no properties yet";
     EXPECT_TRUE(DtIsBooleanOrUFix1(&table, bitAlias) && DtIsBooleanOrUFix1(&table, boolAlias));
     EXPECT_FALSE(DtIsBooleanOrUFix1(&table, scaledBit));
     EXPECT_TRUE(DtIsBuiltInOrUFix1(&table, bitAlias) && DtIsBuiltInOrUFix1(&table, boolAlias));

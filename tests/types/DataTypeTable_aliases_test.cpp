@@ -72,6 +72,22 @@ TEST_F(AliasesTest, OpaqueCopiesTakeSizeFunctionsAndNames) {
     EXPECT_EQ(table.registerOpaqueDataType(source, nullptr), copy);
 }
 
+TEST_F(AliasesTest, OpaqueCopiesTakeWhatIsSerializedOnlyWhereTheSourceHasIt) {
+    DataType source(14, "Opaque", dtSourceBuiltIn);
+    source.setSize(4);
+    source.setDeserializeFcn([](void*, const void*, unsigned long, unsigned long) { return 1; });
+    source.setSerializeSizeFcn([](const void*) { return 8ul; });
+    source.setSerializeFcnName("serialize");
+    source.setDeserializeFcnName("deserialize");
+    const DataType* r = record(table.registerOpaqueDataType(&source, nullptr));
+    EXPECT_EQ(r->getSerializeFcn(), nullptr);
+    EXPECT_EQ(r->getDeserializeFcn(), source.getDeserializeFcn());
+    EXPECT_EQ(r->getSerializeSizeFcn(), source.getSerializeSizeFcn());
+    EXPECT_EQ(r->getSerializeFcnName(), "serialize");
+    EXPECT_EQ(r->getDeserializeFcnName(), "deserialize");
+    EXPECT_EQ(r->getSerializeSizeFcnName(), "");
+}
+
 TEST_F(AliasesTest, AnOpaqueCopyWithoutASizeIsRefused) {
     const DataType source(14, "Opaque", dtSourceBuiltIn);
     EXPECT_RAISES(table.registerOpaqueDataType(&source, nullptr), id("InvalidDataTypeSize"), "Opaque", -1);

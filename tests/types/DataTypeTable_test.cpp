@@ -232,6 +232,23 @@ TEST(DataTypeTable, NumericQuestions) {
     record->setProperties(&prop);
     EXPECT_TRUE(table.Is64BitType(wide));
     EXPECT_FALSE(table.Is64BitType(6));
+    const std::pair<const char*, void (*)(fxpDataTypeProp&)> others[] = {
+        {"Mode", [](fxpDataTypeProp& p) { p.DataTypeMode = FXP_DT_SCALED_DOUBLE; }},
+        {"Exponent", [](fxpDataTypeProp& p) { p.FixedExponent = -1; }},
+        {"Slope", [](fxpDataTypeProp& p) { p.SlopeAdjustmentFactor = 1.5; }},
+        {"Bias", [](fxpDataTypeProp& p) { p.Bias = 1; }},
+        {"Width", [](fxpDataTypeProp& p) { p.WordLength = 63; }},
+    };
+    for (const auto& [name, change] : others) {
+        SCOPED_TRACE(name);
+        fxpDataTypeProp other = prop;
+        change(other);
+        const int typeId = table.registerDataType(name, dtSourceFixpt, nullptr);
+        DataType* otherRecord = table.getDataTypeAliasedThruTo(typeId);
+        otherRecord->setPropertiesSize(sizeof other);
+        otherRecord->setProperties(&other);
+        EXPECT_FALSE(table.Is64BitType(typeId));
+    }
     EXPECT_EQ(table.getDataTypeProperties("caller", wide), record->getProperties());
     EXPECT_RAISES(table.getDataTypeProperties("caller", 99), id("InvalidDataTypeId"), 99);
 }

@@ -19,9 +19,10 @@ isThere() {
     case $1 in
     g++) has c++ ;;
     ninja-build) has ninja ;;
-    cmake | git | python3 | pkg-config | file | chromium | gdb | doxygen) has "$1" ;;
+    cmake | git | python3 | pkg-config | file | chromium | gdb | doxygen | valgrind) has "$1" ;;
     chromium-driver) has chromedriver ;;
     clang) has clang++ ;;
+    llvm) has llvm-profdata && has llvm-cov ;;
     dpkg-dev) has dpkg-shlibdeps ;;
     python3-*) python3 -c "import ${1#python3-}" 2>/dev/null ;;
     libboost*-dev) hasHeader boost/version.hpp ;;
