@@ -21,14 +21,18 @@ qlsvDiagnosticImpl* diagnosticOf(const resource_core::BaseMsgID& message) {
 }
 
 void append(qlsvDiagnosticImpl*& first, qlsvDiagnosticImpl* behind) {
-    if (behind && qlsvGetNumItemsInDiagnostic(behind) > 0 && behind != first)
+    if (!behind || qlsvGetNumItemsInDiagnostic(behind) == 0 || behind == first) return;
+    try {
         qlsvConcatenateDiagnosticsNoCheck(first, behind, true);
+    } catch (...) {
+        qlsvDiscardDiagnostic(behind);
+        throw;
+    }
 }
 
 qlsvDiagnosticImpl* withBlockName(qlsvDiagnosticImpl* diagnostic, const char* blockName) {
-    if (diagnostic && blockName && *blockName)
-        append(diagnostic, diagnosticOf(Quillane::DataType::BlockDataTypeError(blockName)));
-    return diagnostic;
+    if (!blockName || !*blockName) return diagnostic;
+    return extended(diagnostic, [&] { return diagnosticOf(Quillane::DataType::BlockDataTypeError(blockName)); });
 }
 
 } // namespace QLTypeSys::failure

@@ -34,8 +34,21 @@ qlsvDiagnosticImpl* diagnosticToRaise(const resource_core::BaseMsgID& message);
 /// A diagnostic that holds the message, for functions that return it instead of throwing.
 qlsvDiagnosticImpl* diagnosticOf(const resource_core::BaseMsgID& message);
 
-/// Puts `behind` behind `first` when it holds a message and is another object.
+/// Puts `behind`, which it takes over, behind `first` when it holds a message and is another object.
 void append(qlsvDiagnosticImpl*& first, qlsvDiagnosticImpl* behind);
+
+/// Puts what `make` returns, another diagnostic, behind the diagnostic when there is one. When there is no memory for
+/// that, the diagnostic is discarded.
+template <class Make> qlsvDiagnosticImpl* extended(qlsvDiagnosticImpl* diagnostic, Make&& make) {
+    if (!diagnostic) return nullptr;
+    try {
+        append(diagnostic, make());
+    } catch (...) {
+        qlsvDiscardDiagnostic(diagnostic);
+        throw;
+    }
+    return diagnostic;
+}
 
 /// Puts BlockDataTypeError behind the diagnostic when there is one and `blockName` is neither null nor empty.
 qlsvDiagnosticImpl* withBlockName(qlsvDiagnosticImpl* diagnostic, const char* blockName);

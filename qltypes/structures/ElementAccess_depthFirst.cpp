@@ -117,8 +117,14 @@ long DFSElementAccess::getFlatElementIdx(long idx) const {
 }
 
 void DFSElementAccess::getFullPath(long idx, bool fromRoot, Path& path) const {
-    followPath(&ElementIndex::of(table_, dataTypeId_), idx, fromRoot,
-               [&](std::string_view name, long shown) { path.emplace_back(name, shown); });
+    const auto numBefore = static_cast<Path::difference_type>(path.size());
+    try {
+        followPath(&ElementIndex::of(table_, dataTypeId_), idx, fromRoot,
+                   [&](std::string_view name, long shown) { path.emplace_back(name, shown); });
+    } catch (...) {
+        path.erase(path.begin() + numBefore, path.end());
+        throw;
+    }
 }
 
 std::u16string DFSElementAccess::getFullPathAsString(long idx, bool fromRoot) const {

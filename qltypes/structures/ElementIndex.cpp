@@ -102,9 +102,13 @@ ElementIndex& ElementIndex::current() {
         writeDown(varDimsOffset_);
         for (const Nested& nested : numbering_.nested) // written answers may point to heads that these made
             if (std::find(kept_.begin(), kept_.end(), nested.index) == kept_.end()) kept_.push_back(nested.index);
+        SpanSearch nodes, raw;
+        nodes.prepare(std::ssize(numbering.elements), [&](long i) { return numbering.lastNode(i); });
+        raw.prepare(std::ssize(numbering.elements), [&](long i) { return numbering.rawEnd(i); });
+        // Nothing from here on can fail.
         numbering_ = std::move(numbering);
-        nodes_.prepare(numImmediate(), [this](long i) { return lastNode(i); });
-        raw_.prepare(numImmediate(), [this](long i) { return rawEnd(i); });
+        nodes_ = std::move(nodes);
+        raw_ = std::move(raw);
         askedElements_.reset(numbering_.numDFS); // now that it has another number of nodes
         root_ = nullptr;
         offset_.numMoved = 0;
@@ -330,9 +334,9 @@ long ElementIndex::sum(long idx, Summands ElementIndex::*which) {
 // Copies the field again, after writing down what was answered from the copy.
 void ElementIndex::renew(Summands& what) {
     writeDown(what);
+    varDimsOffsets_.resize(numbering_.elements.size());
     what.numMoved = 0;
     what.isUncopied = false;
-    varDimsOffsets_.resize(numbering_.elements.size());
     for (long i = 0; i < numImmediate(); ++i)
         copyOf(i, what) = immediate(i).*what.field;
 }
@@ -382,8 +386,13 @@ bool ElementIndex::hasWrittenAnswersBelow() {
     writtenCheckedAt_ = now; // before the nested ones are asked: a faulty structure may contain itself
     hasWrittenBelow_ = false;
     bool found = !written_->empty();
-    for (const Nested& nested : numbering_.nested)
-        found = found || nested.index->current().hasWrittenAnswersBelow();
+    try {
+        for (const Nested& nested : numbering_.nested)
+            found = found || nested.index->current().hasWrittenAnswersBelow();
+    } catch (...) {
+        writtenCheckedAt_ = 0;
+        throw;
+    }
     return hasWrittenBelow_ = found;
 }
 
@@ -469,16 +478,21 @@ long ElementIndex::rawWithin(long idx) {
 
 void ElementIndex::readRaw() {
     if (rawReadAt_ == readAt_ && readAt_ == edits()) return;
-    rawReadAt_ = readAt_;
-    rawBefore_.assign(1, 0);
     rawBefore_.reserve(numbering_.elements.size() + 1);
-    for (long i = 0; i < numImmediate(); ++i) {
-        if (lastNode(i) >= numbering_.numDFS) break; // no index lies behind it
-        const Nested* const nested = nestedIn(i);
-        long raw = wrappingSubtract(rawEnd(i), rawEnd(i - 1));
-        if (nested) // kept: one instance for a width of 0 or less
-            raw = wrappingMultiply(std::max(nested->width, 1L), nested->index->current().rawWithin(nested->numDFS));
-        rawBefore_.push_back(wrappingAdd(rawBefore_.back(), raw));
+    rawBefore_.assign(1, 0);
+    rawReadAt_ = readAt_; // before the nested ones are asked: a faulty structure may contain itself
+    try {
+        for (long i = 0; i < numImmediate(); ++i) {
+            if (lastNode(i) >= numbering_.numDFS) break; // no index lies behind it
+            const Nested* const nested = nestedIn(i);
+            long raw = wrappingSubtract(rawEnd(i), rawEnd(i - 1));
+            if (nested) // kept: one instance for a width of 0 or less
+                raw = wrappingMultiply(std::max(nested->width, 1L), nested->index->current().rawWithin(nested->numDFS));
+            rawBefore_.push_back(wrappingAdd(rawBefore_.back(), raw));
+        }
+    } catch (...) {
+        rawReadAt_ = 0;
+        throw;
     }
 }
 

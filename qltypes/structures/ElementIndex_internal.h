@@ -148,6 +148,11 @@ class ElementIndex {
         int size = -1;                    // bytes of the structure
         std::optional<int> invalidTypeId; // of the first element without a valid type
 
+        long lastNode(long element) const {
+            return element < 0 ? 0 : elements[static_cast<std::size_t>(element)].lastNode;
+        }
+        long rawEnd(long element) const { return element < 0 ? 0 : raw[static_cast<std::size_t>(element)]; }
+
         bool operator==(const Numbering&) const = default;
     };
 
@@ -170,8 +175,8 @@ class ElementIndex {
     static const std::shared_ptr<ElementIndex>& shared(const DataTypeTable* table, int id, StructDataType& record);
 
     const Immediate& copied(long element) const { return numbering_.elements[static_cast<std::size_t>(element)]; }
-    long lastNode(long element) const { return element < 0 ? 0 : copied(element).lastNode; }
-    long rawEnd(long element) const { return element < 0 ? 0 : numbering_.raw[static_cast<std::size_t>(element)]; }
+    long lastNode(long element) const { return numbering_.lastNode(element); }
+    long rawEnd(long element) const { return numbering_.rawEnd(element); }
     long elementAtNode(long idx) const;
     long& copyOf(long element, const Summands& what);
     Numbering read() const;

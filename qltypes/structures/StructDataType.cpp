@@ -50,9 +50,16 @@ void StructDataType::destroyScalarElement(void*) const                          
 // clang-format on
 
 void StructDataType::setNumElements(long count) {
-    elements_.resize(static_cast<std::size_t>(count));
-    for (StructElement*& slot : elements_)
-        slot = new StructElement; // kept: over whatever was there
+    std::vector<StructElement*> made(static_cast<std::size_t>(count));
+    try {
+        for (StructElement*& slot : made)
+            slot = new StructElement;
+    } catch (...) {
+        for (StructElement* element : made)
+            delete element;
+        throw;
+    }
+    elements_.swap(made); // kept: over whatever was there
     noteEdit();
 }
 

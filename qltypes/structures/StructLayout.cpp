@@ -81,6 +81,9 @@ struct StructLayoutPass {
     qlsvDiagnosticImpl* run();
     bool place(StructElement& element, bool isLast);
     void buildGround();
+
+  private:
+    class Former;
 };
 
 // False when the structure grew beyond the limit.
@@ -123,7 +126,37 @@ void StructLayoutPass::buildGround() {
     }
 }
 
+// Puts back what a layout stores before it needs memory for the ground.
+class StructLayoutPass::Former {
+  public:
+    explicit Former(StructDataType& record)
+        : record_(record), counts_{record.numFlatElements_, record.numRawElements_, record.numDFSElements_},
+          plainFlags_{record.plainCopy_, record.plainConstruct_, record.plainDestroy_},
+          propertiesCached_(record.propertiesCached_), derived_(record.derived_) {}
+
+    void putBack() const {
+        for (StructElement* element : record_.elements_)
+            element->setOffset(-1);
+        record_.setNumFlatElements(counts_[0]);
+        record_.setNumRawElements(counts_[1]);
+        record_.setNumDFSElements(counts_[2]);
+        record_.plainCopy_ = plainFlags_[0];
+        record_.plainConstruct_ = plainFlags_[1];
+        record_.plainDestroy_ = plainFlags_[2];
+        record_.propertiesCached_ = propertiesCached_;
+        record_.derived_ = derived_;
+    }
+
+  private:
+    StructDataType& record_;
+    const long counts_[3];
+    const bool plainFlags_[3];
+    const bool propertiesCached_;
+    const FrequentlyAccessedProperties derived_;
+};
+
 qlsvDiagnosticImpl* StructLayoutPass::run() {
+    const Former former(record);
     record.createCacheForFrequentlyAccessedProperties(table);
     const std::vector<StructElement*>& elements = record.getElements();
     if (elements.empty()) return nullptr;
@@ -132,11 +165,16 @@ qlsvDiagnosticImpl* StructLayoutPass::run() {
             return failure::diagnosticOf(failure::message("Quillane:General", "InvalidDataTypeSizeInDataTypeTable",
                                                           largestSize, DtGetDataTypeName(table, id)));
     }
+    const bool isFirstLayout = record.getSize() == -1; // then the ground starts zero-filled
     record.setNumFlatElements(numFlat);
     record.setNumRawElements(numRaw);
     record.setNumDFSElements(numDFS);
-    const bool isFirstLayout = record.getSize() == -1; // then the ground starts zero-filled
-    record.setSize(static_cast<int>(offset));
+    try {
+        record.setSize(static_cast<int>(offset));
+    } catch (const foundation::core::except::IException& e) {
+        if (e.diagnostic() && e.diagnostic()->isOutOfMemory()) former.putBack(); // then it never had a size
+        throw;
+    }
     record.setGroundHasNonZeroStoredValue(groundHasNonZero);
     if (!groundIsZero || !isFirstLayout) buildGround();
     return nullptr;

@@ -17,6 +17,8 @@ class DataTypeTable;
 /// Structures nested in it must have been laid out before. A structure without elements keeps what it has.
 /// Null on success. A diagnostic with `InvalidDataTypeSizeInDataTypeTable` when the structure would pass 2147483647
 /// bytes, or with what an element without a valid type or the setting of the size raised; it belongs to the caller.
+/// What was laid out up to there stays: the offsets of the elements in front, and the flags; where the size was refused
+/// the counts too. Without memory for the ground nothing stays, and the offsets are -1.
 /// Unchecked: `id` must be a structure or an alias of one.
 QL_EXPORT qlsvDiagnosticImpl* DtComputeDerivedStructAttributes(QLTypeSys::DataTypeTable* table, int id);
 

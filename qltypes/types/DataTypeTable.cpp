@@ -374,20 +374,17 @@ int DataTypeTable::enter(std::unique_ptr<DataType> record, int existing, const c
     DataType* const entered = record.get();
     addDataType(entered);
     record.release();
-    const auto orTakeBack = [&](const auto& work) {
-        try {
-            work();
-        } catch (...) {
-            if (existing == DATA_TYPE_ID_INVALID) dataTypeIdsByName_->erase(entered->getName());
-            dataTypes_.pop_back();
-            delete entered;
-            noteStructureEdit();
-            throw;
-        }
-    };
-    if (complete) orTakeBack(complete);
-    checkWithClient(entered, blockName);
-    if (existing != DATA_TYPE_ID_INVALID) orTakeBack([&] { replaceDataType(recordAt(existing), entered); });
+    try {
+        if (complete) complete();
+        checkWithClient(entered, blockName);
+        if (existing != DATA_TYPE_ID_INVALID) replaceDataType(recordAt(existing), entered);
+    } catch (...) {
+        if (existing == DATA_TYPE_ID_INVALID) dataTypeIdsByName_->erase(entered->getName());
+        delete dataTypes_.back();
+        dataTypes_.pop_back();
+        noteStructureEdit();
+        throw;
+    }
     return entered->getId();
 }
 
@@ -396,7 +393,8 @@ void DataTypeTable::checkWithClient(DataType* record, const char* blockName) {
     try {
         clientDataTypeCheckCallback_->check(record, blockName);
     } catch (const foundation::core::except::IException&) {
-        removeDataType(record); // kept: on the way to a replacement this erases the name of the old record too
+        // kept: on the way to a replacement this is the name of the old record too
+        dataTypeIdsByName_->erase(record->getName());
         throw;
     }
 }
@@ -422,10 +420,10 @@ qlsvDiagnosticImpl* DataTypeTable::RegisterDataType(DataTypeTable* table, const 
                                                     DataTypeSource source, int* id) {
     qlsvDiagnosticImpl* diagnostic =
         failure::diagnosticFrom([&] { *id = table->registerDataType(name, source, blockName); });
-    if (diagnostic && utStrlen(blockName) != 0)
-        failure::append(diagnostic,
-                        failure::diagnosticToRaise(QuillaneTypes::general::DataTypeErrorFromBlock(blockName)));
-    return diagnostic;
+    if (utStrlen(blockName) == 0) return diagnostic;
+    return failure::extended(diagnostic, [&] {
+        return failure::diagnosticToRaise(QuillaneTypes::general::DataTypeErrorFromBlock(blockName));
+    });
 }
 
 void DataTypeTable::initializeFixptDataTypeAtomicity(DataType* record, int wordLength) const {

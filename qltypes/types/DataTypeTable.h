@@ -82,7 +82,8 @@ class QL_EXPORT DataTypeTable {
     /// Registers an empty structure. Raises as registerDataType.
     virtual int registerStructDataType(const char* name, DataTypeSource source, const char* blockName);
     /// Registers a string type of at most `maxLength` UTF-16 units; 0 is dynamic. A null name is made from the length,
-    /// and "character" of length 1 is registered with it. Raises as registerDataType, and out of memory.
+    /// and "character" of length 1 is registered before it, which stays when the other one fails. Raises as
+    /// registerDataType, and out of memory.
     virtual int registerStringDataType(unsigned long maxLength, const char* name);
     /// Registers a date-time type under the name that the type gives itself; `name` is only passed to the client's
     /// check. Its size is the word length of the storage in bits. Raises as registerDataType, also for a type whose own
@@ -94,9 +95,9 @@ class QL_EXPORT DataTypeTable {
     /// matrix itself. Raises as registerDataType, and `InvalidDataTypeId`.
     virtual int registerDynamicMatrixDataType(int elementId, unsigned long numDims);
     /// Registers an image type, and the type that stores it: a dynamic matrix, or "cv_Mat" when the hook
-    /// "ImageTypeImplementation" is 1. Raises as registerDataType, `InvalidImageTypeNumChannels` and
-    /// `InvalidImageTypeNumChannels2` (the dynamic matrix then stays), and `InvalidDataTypeId` when there is no type to
-    /// store it.
+    /// "ImageTypeImplementation" is 1. The type that stores it stays when the image fails. Raises as registerDataType,
+    /// `InvalidImageTypeNumChannels` and `InvalidImageTypeNumChannels2`, out of memory, and `InvalidDataTypeId` when
+    /// there is no type to store it.
     virtual int registerImageDataType(unsigned long numChannels, SSImageColorFormat colorFormat,
                                       SSImageDataLayout dataLayout, BuiltInDTypeId baseType);
     /// Buses are a subclass's business: -1 here.
@@ -204,7 +205,8 @@ class QL_EXPORT DataTypeTable {
 
     // --- Registration ------------------------------------------------------------------------------------------------
 
-    /// Appends a record and enters its name; a name that is there keeps its old entry. Takes the record over.
+    /// Appends a record and enters its name; a name that is there keeps its old entry. Takes the record over, unless it
+    /// throws for lack of memory.
     void addDataType(DataType* record);
     /// Undoes the registration just made: erases the record's name and deletes the last record, whatever `record` is.
     void removeDataType(DataType* record);
@@ -228,7 +230,8 @@ class QL_EXPORT DataTypeTable {
 
     // --- Aliases, replacement, custom types --------------------------------------------------------------------------
 
-    /// Puts `replacement`, which is the last record, in the place of `old`, which is deleted.
+    /// Puts `replacement`, which is the last record, in the place of `old`, which is deleted. Without memory for that
+    /// nothing is changed.
     void replaceDataType(DataType* old, DataType* replacement);
     /// Turns a plain record that is not defined yet into an alias under its identifier. Raises
     /// `UndefinedDataTypeToBeAliasedTo`, `InconsistentDataTypeIdAliasedTo`, `CannotSetAliasForDefinedType` and

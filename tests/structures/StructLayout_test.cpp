@@ -160,10 +160,24 @@ TEST(StructLayout, ExactlyTheLimitPassesBeforeTheLastElement) {
     Structures s;
     const int id = s.define("S", {{"a", int8, {0x7fffffff}}, {"b", int8, {-8}}}); // 0x7fffffff, then 0x7ffffff7
     utFailAllocationAt(1);
-    EXPECT_NE(described(DtComputeDerivedStructAttributes(&s.table, id)), fine); // of memory, behind the counts
+    EXPECT_EQ(described(DtComputeDerivedStructAttributes(&s.table, id)),
+              testsupport::expectedMessage("Quillane:Services:OutOfMemory")); // no 4 GiB for a ground
     utFailAllocationAt(0);
-    EXPECT_EQ(s.record(id)->getNumDFSElements(), 3);
-    EXPECT_EQ(s.element(id, 1)->offset, 0x7fffffff);
+}
+
+TEST(StructLayout, WithoutMemoryForTheGroundNothingIsLaidOut) {
+    Structures s;
+    const int id = s.define("S", {{"a", int8}, {"b", double_, {1}, true}});
+    utFailAllocationAt(1);
+    EXPECT_EQ(described(DtComputeDerivedStructAttributes(&s.table, id)),
+              testsupport::expectedMessage("Quillane:Services:OutOfMemory"));
+    utFailAllocationAt(0);
+    EXPECT_EQ(attributes(s, id), (Attributes{{-1, -1}, -1, 0, 0, 0}));
+    EXPECT_FALSE(s.record(id)->hasComplexData());
+    s.element(id, 0)->setDataTypeId(s.table.registerStringDataType(0, nullptr));
+    EXPECT_EQ(described(DtComputeDerivedStructAttributes(&s.table, id)), fine);
+    EXPECT_TRUE(s.record(id)->hasComplexData());
+    EXPECT_TRUE(s.record(id)->hasStringData());
 }
 
 TEST(StructLayout, AFailureKeepsTheOffsetsAndStoresNothingElse) {
