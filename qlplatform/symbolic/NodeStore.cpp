@@ -55,16 +55,25 @@ NodeId NodeStore::append(const Key& key) {
     const NodeId id = static_cast<NodeId>(records_.size());
     Record record{key.head, key.first, key.second, noNode};
     if (isIntegerNode(key)) record.head |= integerBit;
-    if (static_cast<SymbolicOp>(key.head & opMask) == SymbolicOp::StringSymbol) {
-        record.first = static_cast<std::uint32_t>(names_.size());
-        names_.emplace_back(key.name);
-    } else if (!key.pooled.empty()) {
-        record.first = static_cast<std::uint32_t>(pool_.size());
-        pool_.insert(pool_.end(), key.pooled.begin(), key.pooled.end());
+    const std::size_t numNames = names_.size();
+    const std::size_t numPooled = pool_.size();
+    try {
+        if (static_cast<SymbolicOp>(key.head & opMask) == SymbolicOp::StringSymbol) {
+            record.first = static_cast<std::uint32_t>(numNames);
+            names_.emplace_back(key.name);
+        } else if (!key.pooled.empty()) {
+            record.first = static_cast<std::uint32_t>(numPooled);
+            pool_.insert(pool_.end(), key.pooled.begin(), key.pooled.end());
+        }
+        if (ids_.size() == ids_.max_load()) growIds();
+        records_.push_back(record);
+        ids_.insert(id);
+    } catch (...) { // a node that no key leads to would be listed, and made again
+        if (records_.size() > id) records_.pop_back();
+        pool_.resize(numPooled);
+        names_.resize(numNames);
+        throw;
     }
-    if (ids_.size() == ids_.max_load()) growIds();
-    records_.push_back(record);
-    ids_.insert(id);
     return id;
 }
 

@@ -62,6 +62,8 @@ class QL_EXPORT SymbolRegistry {
     void dropExprTable();
     /// Makes an empty expression table.
     void makeExprTable();
+    /// Exchanges the expression table for another, which takes the place of `other`. Either may be null.
+    void swapExprTable(std::unique_ptr<SymbolicExprTable>& other) noexcept { exprTable_.swap(other); }
 
   private:
     SymbolDomain domain_;

@@ -39,21 +39,29 @@ void SymbolicDimsTable::initialize() {
     exprs.addSymbol("INHERIT");
     exprs.addSymbol("NOSYMBOLIC");
     exprs.addBoolSymbols();
+    const unsigned long oneInt = exprs.addInt(1);
+    oneDoubleExprId_ = exprs.addDouble(1.0);
+    oneIntExprId_ = oneInt;
     symbolsRegistered_ = false;
     lossOfSymbolicDimsDiag_ = diagNotAsked;
-    oneIntExprId_ = exprs.addInt(1);
-    oneDoubleExprId_ = exprs.addDouble(1.0);
 }
 
 void SymbolicDimsTable::resetToBuiltin() {
-    constraints_.reset();
-    dropExprTable();
+    auto exprs = std::make_unique<QL::SymbolicExprTable>(getExprTable().getDomain());
+    std::unique_ptr<SymbolicDimsConstraints> constraints;
+    swapExprTable(exprs);
+    try {
+        constraints = std::make_unique<SymbolicDimsConstraints>(this);
+        initialize();
+    } catch (...) {
+        constraints.reset();
+        swapExprTable(exprs);
+        throw;
+    }
+    constraints_.swap(constraints);
     displayStrings_.clear();
     torvexExprs_.clear();
     headerFiles_.clear();
-    makeExprTable();
-    constraints_ = std::make_unique<SymbolicDimsConstraints>(this);
-    initialize();
 }
 
 const QLBlock* SymbolicDimsTable::getOriginalBlock(const QLBlock* block) const { return block; }
@@ -241,10 +249,10 @@ void SymbolicDimsTable::getModuloConstraints(std::vector<SymbolicDimsCGConstrain
 SymbolicDimsTable::DimsRegistration SymbolicDimsTable::importSymbolicDims(const SymbolicDimsTable& other, int id,
                                                                           const QLBlock* block) {
     if (!other.isaSymbolicDimension(id)) return {id, nullptr};
-    symbolsRegistered_ = true;
     QL::SymbolicExprTable& exprs = getExprTable();
     const unsigned long copy = QL::SymbolicExprCopy(other.getExprTable(), exprs).copy(exprIdOf(id));
     const int imported = symbolicIdOf(QL::SymbolicExprT2C(exprs)(copy));
+    symbolsRegistered_ = true;
     std::vector<std::string> names;
     getSymbolicDimsSymbols(imported, names);
     for (const std::string& name : names) {

@@ -49,7 +49,8 @@ class QL_EXPORT SymbolicDimsTable : public QL::SymbolRegistry {
     /// A new table for a model, or null as here.
     virtual SymbolicDimsTable* CreateSymbolicDimsTable(QLRootBD* model) const;
 
-    /// Brings the table back to its first state: every id and handle becomes meaningless.
+    /// Brings the table back to its first state: every id and handle becomes meaningless. Without memory for a new
+    /// first state the table stays as it is.
     virtual void resetToBuiltin();
 
     /// Registers a token, or an expression, for a block. Here nothing is registered: id 0 and no diagnostic.

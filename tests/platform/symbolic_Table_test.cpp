@@ -240,6 +240,7 @@ TEST_F(SymbolicTable, ARegistryOwnsATable) {
         Validating() : SymbolRegistry(QL::SymbolDomain::Integers) {}
         using SymbolRegistry::dropExprTable;
         using SymbolRegistry::makeExprTable;
+        using SymbolRegistry::swapExprTable;
     } registry;
     EXPECT_EQ(registry.getExprTable().getDomain(), QL::SymbolDomain::Integers);
     EXPECT_FALSE(registry.convertExprId2ValidSymbolicId(0).has_value());
@@ -253,6 +254,10 @@ TEST_F(SymbolicTable, ARegistryOwnsATable) {
     const QL::SymbolRegistry::Registration nothing{QL::SymbolicExprTable::noExpr, nullptr};
     std::vector<double> values;
     EXPECT_EQ(registry.registerSymbolicTExpr(std::u16string(u"a"), nullptr, nullptr, nullptr, values), nothing);
+    auto other = std::make_unique<QL::SymbolicExprTable>();
+    registry.swapExprTable(other);
+    EXPECT_EQ(registry.getExprTable().getNumExprs(), 0u);
+    EXPECT_EQ(other->get(a).getName(), "a");
     registry.dropExprTable();
     EXPECT_FALSE(registry.hasExprTable());
     EXPECT_FALSE(registry.convertExprId2ValidSymbolicId(0).has_value());
