@@ -134,4 +134,52 @@ TEST(AllocationFailure, AMatrixCanStillBeUsedAndTakenDown) {
     EXPECT_EQ(DynamicMatrixMemoryManager::GetMemoryManager().numBlocks(), 0u);
 }
 
+TEST(AllocationFailure, AValueIsBuiltAndCopiedByIdOrNotAtAll) {
+    struct Slot {
+        alignas(16) unsigned char bytes[sizeof(DynamicMatrix)] = {};
+    };
+    ClientTable table;
+    const int text = table.registerStringDataType(0, "Text");
+    const int matrix = table.registerDynamicMatrixDataType(DATA_TYPE_ID_UINT8, 2);
+    const int image =
+        table.registerImageDataType(3, SSImageColorFormat_RGB, SSImageDataLayout_ColumnMajorPlanar, DATA_TYPE_ID_UINT8);
+    const unsigned long dims[] = {5, 7, 3};
+    const std::vector<char> data(5 * 7 * 3, 'x');
+    const auto fill = [&](int id, Slot& slot) {
+        if (id == text)
+            StringDataType::writeUStringScalarToVoidPtrOutput(u"a text that is too long for a slot", &slot, 0);
+        else
+            EXPECT_TRUE(table.dataConstruct(id, id == image ? 3 : 2, dims, 1, data.data(), &slot));
+    };
+    const auto isFilled = [&](int id, Slot& slot) {
+        if (id == text)
+            return StringDataType::getUStringScalarFromVoidPtrInput(&slot) == u"a text that is too long for a slot";
+        const void* const held = table.getDataTypeAt(static_cast<unsigned long>(id + 1))->containedData(&slot);
+        return held && std::memcmp(held, data.data(), id == image ? 105 : 35) == 0;
+    };
+    using stringutil::DynamicStringPool;
+    const DynamicStringPool& pool = DynamicStringPool::GetPool(DynamicStringPool::GlobalPoolName);
+    const DynamicMatrixMemoryManager& matrices = DynamicMatrixMemoryManager::GetMemoryManager();
+    for (const int id : {text, matrix, image})
+        for (unsigned long n = 1;; ++n) {
+            SCOPED_TRACE(testing::Message() << DtGetDataTypeName(&table, id) << ", allocation " << n);
+            Slot from, to;
+            const bool built = !failsAt(n, [&] { table.construct(id, &from); });
+            EXPECT_EQ(pool.size(), built && id == text ? 1u : 0u);
+            EXPECT_EQ(matrices.numBlocks(), 0u);
+            if (!built) table.construct(id, &from);
+            fill(id, from);
+            table.construct(id, &to);
+            const bool copied = !failsAt(n, [&] { table.deepCopy(id, &to, &from); });
+            EXPECT_TRUE(isFilled(id, from));
+            if (!copied) table.deepCopy(id, &to, &from);
+            EXPECT_TRUE(isFilled(id, to));
+            table.destruct(id, &from);
+            table.destruct(id, &to);
+            EXPECT_EQ(pool.size(), 0u);
+            EXPECT_EQ(matrices.numBlocks(), 0u);
+            if (built && copied) break;
+        }
+}
+
 } // namespace
