@@ -1,9 +1,10 @@
 #include "qltypes/types/DataType.h"
 
 #include <cstring>
+#include <initializer_list>
 #include <limits>
 #include <ostream>
-#include <regex>
+#include <string_view>
 
 #include "qlplatform/arrays/HostArray.h"
 #include "qlplatform/memory/Memory.h"
@@ -327,9 +328,21 @@ void DataType::setInterface(txArray_tag* array) {
 // --- Names and printing ----------------------------------------------------------------------------------------------
 
 std::string DataType::getNameStripDTOPrefix() const {
-    if (!getIsType(dtqStruct)) return getName();
-    static const std::regex prefix("^dto(Dbl|Sgl|Scl)(Flt|Fxp)?_");
-    return std::regex_replace(getName(), prefix, "");
+    const std::string name = getName();
+    if (!getIsType(dtqStruct)) return name;
+    // dto(Dbl|Sgl|Scl)(Flt|Fxp)?_
+    std::string_view rest = name;
+    const auto drop = [&rest](std::initializer_list<std::string_view> words) {
+        for (const std::string_view word : words) {
+            if (!rest.starts_with(word)) continue;
+            rest.remove_prefix(word.size());
+            return true;
+        }
+        return false;
+    };
+    if (!drop({"dto"}) || !drop({"Dbl", "Sgl", "Scl"})) return name;
+    drop({"Flt", "Fxp"});
+    return drop({"_"}) ? std::string(rest) : name;
 }
 
 void DataType::print(std::ostream& os) const {

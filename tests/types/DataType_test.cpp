@@ -342,10 +342,16 @@ TEST(DataType, OverridePrefixesGoFromStructuresOnly) {
     const struct {
         const char* name;
         const char* stripped;
-    } rows[] = {{"dtoDblFlt_Bus", "Bus"},           {"dtoSgl_Bus", "Bus"},
-                {"dtoSclFxp_Bus", "Bus"},           {"dtoDbl_", ""},
-                {"dtoInt_Bus", "dtoInt_Bus"},       {"XdtoDbl_Bus", "XdtoDbl_Bus"},
-                {"dtoDbl_dtoSgl_Bus", "dtoSgl_Bus"}};
+    } rows[] = {{"dtoDblFlt_Bus", "Bus"},
+                {"dtoSgl_Bus", "Bus"},
+                {"dtoSclFxp_Bus", "Bus"},
+                {"dtoDbl_", ""},
+                {"dtoInt_Bus", "dtoInt_Bus"},
+                {"XdtoDbl_Bus", "XdtoDbl_Bus"},
+                {"dtoDbl_dtoSgl_Bus", "dtoSgl_Bus"},
+                {"dtoDblFltBus", "dtoDblFltBus"},
+                {"dtoFlt_Bus", "dtoFlt_Bus"},
+                {"dtoDbl", "dtoDbl"}};
     for (const auto& row : rows) {
         SCOPED_TRACE(row.name);
         DataType t(14, row.name, dtSourceBuiltIn);
