@@ -343,6 +343,39 @@ TEST(Memory, DoesNotGrowWithTheIndicesAsked) {
 }
 #endif
 
+// --- Wide structures -------------------------------------------------------------------------------------------------
+
+TEST(WideStructures, LeavesAloneAndWithOneNestedAmongThem) {
+    Structures s;
+    const int inner = s.laidOut("In", {{"x", real}, {"y", real}});
+    for (const bool hasNested : {false, true}) {
+        constexpr long count = 150000;
+        constexpr long nestedAt = 70000;
+        std::vector<Element> elements;
+        for (long i = 0; i < count; ++i)
+            elements.push_back({"e" + std::to_string(i), hasNested && i == nestedAt ? inner : real});
+        const int id = s.laidOut(hasNested ? "Mixed" : "Leaves", elements);
+        const DFSElementAccess dfs(&s.table, id);
+        const FlatElementAccess flat(&s.table, id);
+        const RawElementAccess raw(&s.table, id);
+        for (long leaf = count - 1; leaf >= 0; leaf -= 997) { // all of eight bytes
+            const bool isBehind = hasNested && leaf > nestedAt + 1;
+            const long node = leaf + 1 + (hasNested && leaf >= nestedAt ? 1 : 0);
+            ASSERT_EQ(flat.getDFSIdx(leaf), node);
+            ASSERT_EQ(dfs.getFlatElementIdx(node), leaf);
+            ASSERT_EQ(flat.getOffset(leaf), 8 * leaf);
+            ASSERT_EQ(raw.getOffset(leaf), 8 * leaf);
+            ASSERT_EQ(flat.getFullPathAsString(leaf, false), wide("e" + std::to_string(leaf - isBehind)));
+        }
+        const long numLeaves = count + hasNested;
+        const long numNodes = dfs.getNumElements();
+        EXPECT_EQ(flat.getDFSIdx(2 * numLeaves), 2 * numNodes + 1);
+        EXPECT_EQ(dfs.getFlatElementIdx(0), -1);
+        EXPECT_EQ(dfs.getFlatElementIdx(2 * numNodes), -1);
+        EXPECT_EQ(flat.getFullPathAsString(numLeaves + 7, false), u"(1).e7");
+    }
+}
+
 // --- Odd structures --------------------------------------------------------------------------------------------------
 
 TEST(OddStructures, ANestedStructureOfWidthZeroHidesWhatFollows) { // kept
