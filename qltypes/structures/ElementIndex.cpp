@@ -43,11 +43,14 @@ template <class T> void reserveLarge(std::vector<T>& vector, std::size_t count) 
 
 void noteEdit() { numEdits.fetch_add(1, std::memory_order_relaxed); }
 
-void ElementIndexes::release(boost::unordered_map<long, CachedElement>& answers, bool recordGoes) {
+void ElementIndexes::release(boost::unordered_map<long, CachedElement>& answers, bool nobodyAsks) {
     bool anyIsHeld = false;
     const auto letGo = [&](ElementIndex& index) {
         index.record_ = nullptr;
-        if (recordGoes) index.numbering_ = {};
+        if (nobodyAsks) {
+            index.numbering_ = {};
+            index.kept_.clear();
+        }
         anyIsHeld = true;
     };
     if (own && own.use_count() > 1) {
@@ -105,6 +108,12 @@ const std::shared_ptr<ElementIndex>& ElementIndex::shared(const DataTypeTable* t
     for (const auto& [aliasId, index] : indexes.underAliases)
         if (aliasId == id) return index;
     return indexes.underAliases.emplace_back(id, std::make_shared<ElementIndex>(table, id, record)).second;
+}
+
+void ElementIndex::forget(StructDataType& record) {
+    if (record.indexes_) record.indexes_->release(record.cachedElements_, true);
+    record.indexes_.reset();
+    record.cachedElements_.clear();
 }
 
 ElementIndex& ElementIndex::current() {

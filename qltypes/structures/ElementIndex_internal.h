@@ -43,7 +43,8 @@ struct ElementIndexes {
     std::vector<std::pair<int, std::shared_ptr<ElementIndex>>> underAliases;
 
     /// Leaves the indexes that containing structures hold to them, with what they answered in `answers` for the own id.
-    void release(boost::unordered_map<long, CachedElement>& answers, bool recordGoes);
+    /// Where nobody will ask them again they hold on to nothing: structures may have contained each other in turn.
+    void release(boost::unordered_map<long, CachedElement>& answers, bool nobodyAsks);
 };
 
 class ElementIndex {
@@ -87,6 +88,9 @@ class ElementIndex {
     static ElementIndex& of(const DataTypeTable* table, int id);
 
     ElementIndex(const DataTypeTable* table, int id, StructDataType& record);
+
+    /// clearDFSCache for one structure after the other, until nothing is left of what any in the table answered.
+    static void forget(StructDataType& record);
 
     /// This index after reading what changed.
     ElementIndex& current();

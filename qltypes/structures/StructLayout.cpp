@@ -28,7 +28,7 @@ unsigned long roundedUp(unsigned long offset, unsigned long powerOfTwo) {
 // What the pass needs of an element's type.
 struct ElementType {
     const StructDataType* nested; // null for a leaf
-    const void* ground;
+    const void* ground;           // null where there are not `size` bytes of it
     unsigned long size;
     unsigned long alignment; // 0: by DtCorrectOffsetForProperAlignment
     bool groundHasNonZero;   // as the type says; its bytes may say otherwise
@@ -40,8 +40,9 @@ struct ElementType {
         nested = id != DATA_TYPE_ID_AUTO && resolved->getIsType(QLTypeSys::dtqStruct)
                      ? static_cast<const StructDataType*>(resolved)
                      : nullptr;
-        ground = entry->getGround();
         const int bytes = entry->getSize();
+        // An alias keeps the size that its target had: of what the target is now there may be fewer bytes.
+        ground = resolved->getSize() >= bytes ? entry->getGround() : nullptr;
         size = static_cast<unsigned long>(bytes);
         alignment = bytes > 7 ? 8 : bytes > 3 ? 4 : bytes > 1 ? 2 : 1;
         if (CheckForBuiltInDataType(entry->getIdAliasedThruTo()) && size != alignment) alignment = 0;

@@ -13,6 +13,19 @@ namespace {
 
 constexpr const char* general = "QuillaneTypes:general";
 
+// Whether the type, once it is an alias of the target, would come back to itself: by what it names or by where it ends,
+// which a replacement may have parted.
+bool isLoop(const DataTypeTable& table, int id, int target) {
+    if (target == id || table.alreadyAliasedToDirectlyOrIndirectly(target, id)) return true;
+    const auto endOf = [&](int step) {
+        return table.getDataTypeAt(static_cast<unsigned long>(step + 1))->getIdAliasedThruTo();
+    };
+    int step = target;
+    while (step != id && endOf(step) != step)
+        step = endOf(step);
+    return step == id;
+}
+
 } // namespace
 
 int DataTypeTable::registerAliasDataType(const char* name, DataTypeSource source, int aliasedTo,
@@ -24,8 +37,7 @@ int DataTypeTable::registerAliasDataType(const char* name, DataTypeSource source
     if (isRegisteredAlready(name, source, existing)) return existing;
     const DataType* target = recordAt(aliasedTo);
     // About to replace a record that the target reaches: the new alias would stand for itself.
-    if (existing != DATA_TYPE_ID_INVALID &&
-        (aliasedTo == existing || alreadyAliasedToDirectlyOrIndirectly(aliasedTo, existing)))
+    if (existing != DATA_TYPE_ID_INVALID && isLoop(*this, existing, aliasedTo))
         failure::raise(general, "DataTypeAliasLoop", name, target->getName());
     const DataType* thru = recordAt(target->getIdAliasedThruTo());
     return enter(std::make_unique<AliasDataType>(nextId(), name, source, target, thru), existing, blockName);
@@ -83,7 +95,7 @@ void DataTypeTable::setDataTypeIdAliasedTo(int id, int target) {
         failure::raise(general, "InconsistentDataTypeIdAliasedTo", record->getName(), recordAt(target)->getName(),
                        recordAt(present)->getName());
     if (record->getAliasedToLocked()) failure::raise(general, "CannotSetAliasForDefinedType", record->getName());
-    if (target == id || alreadyAliasedToDirectlyOrIndirectly(target, id))
+    if (isLoop(*this, id, target))
         failure::raise(general, "DataTypeAliasLoop", record->getName(), recordAt(target)->getName());
     const DataType* thru = recordAt(recordAt(target)->getIdAliasedThruTo());
     auto made = std::make_unique<AliasDataType>(record, recordAt(target), thru);
@@ -96,7 +108,11 @@ void DataTypeTable::setDataTypeIdAliasedTo(int id, int target) {
         // kept: an alias that ended here now ends at the new alias and forwards in two hops
         if (other->getIdAliasedThruTo() == id) other->updateAliasedThruToType(alias);
     }
-    noteStructureEdit(); // an element of this type may be a nested structure now
+    noteStructureEdit();                // an element of this type may be a nested structure now
+    if (record->getIsType(dtqStruct)) { // its elements go: views of structures around it may have answered with them
+        for (DataType* other : dataTypes_)
+            clearStructureCaches(other);
+    }
     delete record;
 }
 

@@ -14,7 +14,7 @@ int DataTypeTable::registerStructDataType(const char* name, DataTypeSource sourc
 }
 
 void DataTypeTable::clearStructureCaches(DataType* record) {
-    if (record->getIsType(dtqStruct)) static_cast<StructDataType*>(record)->clearDFSCache();
+    if (record->getIsType(dtqStruct)) structures::ElementIndex::forget(static_cast<StructDataType&>(*record));
 }
 
 void DataTypeTable::noteStructureEdit() { structures::noteEdit(); }

@@ -244,6 +244,19 @@ TEST(Freezing, AnswersStayUntilTheyAreCleared) {
     EXPECT_EQ(dfs.getOffset(8), 140);
 }
 
+TEST(Freezing, AnswersGoWithAStructureThatBecomesAnAlias) {
+    Structures s;
+    // Of 0 bytes, which are refused once the counts are stored: so it is not defined, and can become an alias.
+    const int inner = s.define("In", {{"a", 9}});
+    EXPECT_NE(described(DtComputeDerivedStructAttributes(&s.table, inner)), fine);
+    const int outer = s.laidOut("Out", {{"x", DATA_TYPE_ID_DOUBLE}, {"i", inner}});
+    const DFSElementAccess dfs(&s.table, outer);
+    EXPECT_EQ(dfs.getStructElement(3), s.element(inner, 0));
+    s.table.setDataTypeIdAliasedTo(inner, DATA_TYPE_ID_DOUBLE);
+    EXPECT_EQ(dfs.getDataTypeId(3), outer) << "an index that no element has any more";
+    EXPECT_EQ(dfs.getStructElement(2), s.element(outer, 1));
+}
+
 TEST(Freezing, WhatWasNotAskedIsReadAnew) {
     Example e;
     const DFSElementAccess dfs(&e.table, e.outer);
@@ -341,6 +354,32 @@ TEST(Memory, DoesNotGrowWithTheIndicesAsked) {
     }
     EXPECT_LT(bytesInUse(), before) << "a walk in order needs next to nothing";
 }
+
+// What each answered needs elements that the other made.
+void askOfStructuresThatContainedEachOther(bool thenClearsAll) {
+    Structures s;
+    const int one = s.laidOut("One", {{"x", real}, {"y", real}});
+    const int other = s.laidOut("Other", {{"x", one}, {"y", real}});
+    const DFSElementAccess ofOne(&s.table, one), ofOther(&s.table, other);
+    EXPECT_STREQ(ofOther.getName(1), "x");
+    s.element(other, 0)->setDataTypeId(real);
+    EXPECT_STREQ(ofOther.getName(2), "y");
+    s.element(one, 0)->setDataTypeId(other);
+    EXPECT_STREQ(ofOne.getName(1), "x");
+    s.element(one, 0)->setDataTypeId(real);
+    EXPECT_STREQ(ofOne.getName(2), "y");
+    if (thenClearsAll) s.table.setDataTypeIdAliasedTo(s.define("Name", {}), real);
+}
+
+TEST(Memory, StructuresThatContainedEachOtherAreFreed) {
+    for (const bool thenClearsAll : {false, true}) {
+        askOfStructuresThatContainedEachOther(thenClearsAll);
+        const std::size_t before = bytesInUse();
+        for (int i = 0; i < 100; ++i)
+            askOfStructuresThatContainedEachOther(thenClearsAll);
+        EXPECT_LT(bytesInUse(), before + 10000) << thenClearsAll;
+    }
+}
 #endif
 
 // --- Wide structures -------------------------------------------------------------------------------------------------
@@ -436,6 +475,19 @@ TEST(OddStructures, WithoutALayoutThereIsTheRootAlone) {
     EXPECT_EQ(none.getNumElements(), 0);
     EXPECT_EQ(none.getRawElementIdx(3), 0);
     EXPECT_EQ(none.getFlatElementIdx(0), -1);
+}
+
+TEST(OddStructures, ASizeThatIsSetAfterQuestionsIsSeen) {
+    Structures s;
+    const int inner = s.define("In", {{"a", 9}}); // of 0 bytes, which are refused once the counts are stored
+    EXPECT_NE(described(DtComputeDerivedStructAttributes(&s.table, inner)), fine);
+    const int outer = s.laidOut("Out", {{"x", DATA_TYPE_ID_DOUBLE}, {"i", inner, {3}}});
+    const DFSElementAccess ofInner(&s.table, inner), ofOuter(&s.table, outer);
+    EXPECT_STREQ(ofInner.getName(3), "a");
+    EXPECT_STREQ(ofOuter.getName(6), "a");
+    s.record(inner)->setSize(16);
+    EXPECT_EQ(ofInner.getOffset(3), 16);
+    EXPECT_EQ(ofOuter.getOffset(6), s.element(outer, 1)->offset + 16);
 }
 
 TEST(OddStructures, AnElementWithoutATypeIsMetWhenItStandsInTheWay) {

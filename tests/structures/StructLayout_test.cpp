@@ -268,6 +268,20 @@ TEST(StructLayout, AGroundOfManyElements) {
     }
 }
 
+TEST(StructLayout, AGroundWithFewerBytesThanAnAliasSaysIsNotWritten) {
+    Structures s;
+    QLTypeSys::DataType* const boolean = s.table.getDataTypeAt(DATA_TYPE_ID_BOOLEAN + 1);
+    boolean->setSize(8);
+    const int alias = s.alias("A", DATA_TYPE_ID_BOOLEAN); // has 8 bytes for good
+    boolean->setSize(1);
+    const unsigned char one[] = {1};
+    boolean->setGround(one);
+    const int id = s.laidOut("S", {{"a", alias, {2}}, {"b", DATA_TYPE_ID_BOOLEAN}});
+    const unsigned char expected[24] = {0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 1};
+    ASSERT_EQ(s.record(id)->getSize(), 24);
+    EXPECT_EQ(std::memcmp(s.record(id)->getGround(), expected, sizeof expected), 0);
+}
+
 TEST(StructLayout, WidthsBelowZeroNeverWriteOutsideTheGround) {
     Structures s;
     const int id = s.laidOut("S", {{"a", double_, {100}}, {"b", double_, {-99}}});

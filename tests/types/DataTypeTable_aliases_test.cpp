@@ -165,6 +165,19 @@ TEST_F(AliasesTest, AnAliasThatWouldReplaceItsOwnTargetIsALoop) {
     EXPECT_EQ(record(middle)->getIdAliasedThruTo(), 0);
 }
 
+TEST_F(AliasesTest, AnAliasMustNotComeBackByWhereItEndsEither) {
+    const int end = plain("End");
+    const int middle = alias("Middle", end);
+    const int first = alias("First", middle);
+    table.declines = true;
+    EXPECT_EQ(alias("Middle", 0), middle);
+    EXPECT_EQ(record(first)->getIdAliasedThruTo(), end) << "what it names leads to double, and still it ends here";
+    EXPECT_RAISES(alias("End", first), id("DataTypeAliasLoop"), "End", "First");
+    EXPECT_RAISES(table.setDataTypeIdAliasedTo(end, first), id("DataTypeAliasLoop"), "End", "First");
+    EXPECT_EQ(table.getDataTypeAliasedThruTo(first), record(end));
+    EXPECT_EQ(table.getNumDataTypes(), 18);
+}
+
 // --- setDataTypeIdAliasedTo ------------------------------------------------------------------------------------------
 
 TEST_F(AliasesTest, APlainRecordBecomesAnAlias) {
