@@ -43,6 +43,12 @@ void SlowViews::clear(int id) {
         if (key.first == &record(id)) answers.clear();
 }
 
+void SlowViews::forgetLeaves(const QLTypeSys::DataType* deleted) {
+    std::erase_if(leaves_, [deleted](const auto& entry) {
+        return static_cast<const void*>(entry.first) == static_cast<const void*>(deleted);
+    });
+}
+
 // --- Immediate -------------------------------------------------------------------------------------------------------
 
 long SlowViews::immediateRawIdx(int id, long element) const {

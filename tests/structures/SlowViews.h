@@ -61,6 +61,10 @@ class SlowViews {
     bool isMade(const StructElement* element) const { return made_.count(element) > 0; }
     /// Forgets what was answered for a structure.
     void clear(int id);
+    /// The same for all structures.
+    void clearAll() { answers_.clear(); }
+    /// Forgets the leaves of a record that was deleted; any type's.
+    void forgetLeaves(const QLTypeSys::DataType* record);
 
   private:
     struct Answer {
