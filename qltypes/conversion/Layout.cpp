@@ -162,7 +162,7 @@ class Conversion {
 
     void flat() {
         const int parts = vectors_.srcComplex && !cell_.joinsParts ? 2 : 1;
-        if (!pastCaches_ || cell_.copiesBytes)
+        if (!pastCaches_ || (cell_.copiesBytes && !convertWhileKept_))
             convertRun(vectors_.src, vectors_.dst, vectors_.dstCount * parts);
         else
             inBlocks(
