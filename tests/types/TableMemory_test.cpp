@@ -268,7 +268,7 @@ TEST(TableMemory, AQuestionIsAsked) {
     const auto asking = [](auto question) { return [question](Filled& f) { question(f.table, f); }; };
     using Table = EngineTable;
     failEachRow<Filled>({
-        {"name for display", asking([](Table& t, Filled& f) { DtGetDataTypeNameStripDTOPrefix(&t, f.outer); })},
+        {"name for display", asking([](Table& t, Filled& f) { DtGetDataTypeNameStripDTOPrefix(&t, f.open); })},
         {"expression", asking([](Table& t, Filled& f) { (void)(t.getDTACompliantString(f.open) + longName); })},
         {"custom types", asking([](Table& t, Filled&) { t.getAllCustomDataTypeName(); })},
         {"dependencies", asking([](Table& t, Filled& f) {
