@@ -94,11 +94,11 @@ TEST_F(FlatTest, SettersReadsAndHasByStem) {
     PLAIN(Serialize) NAME(Serialize) EXPECT_TRUE(DtHasSerializeFcn(&table, alias));
     PLAIN(Deserialize)
     NAME(Deserialize)
-        PLAIN(SerializeSize) NAME(SerializeSize) PLAIN(SizeOf) NAME(SizeOf) PLAIN(ContainedData) NAME(ContainedData)
-            PLAIN(ContainedDataDims) NAME(ContainedDataDims) PLAIN(UpdateContainedDataDims)
-                NAME(UpdateContainedDataDims) PLAIN(UpdateContainedDataDim) PLAIN(CoderProperties) NAME(CoderProperties)
-                    PLAIN(DataConstruct) NAME(DataConstruct)
-                        EXPECT_EQ(aliasRecord->getUpdateContainedDataDimsFcn(), nullptr)
+    PLAIN(SerializeSize)
+        NAME(SerializeSize) PLAIN(SizeOf) NAME(SizeOf) PLAIN(ContainedData) NAME(ContainedData) PLAIN(ContainedDataDims)
+            NAME(ContainedDataDims) PLAIN(UpdateContainedDataDims) NAME(UpdateContainedDataDims)
+                PLAIN(UpdateContainedDataDim) PLAIN(CoderProperties) NAME(CoderProperties) PLAIN(DataConstruct)
+                    NAME(DataConstruct) EXPECT_EQ(aliasRecord->getUpdateContainedDataDimsFcn(), nullptr)
         << "which the flat function gets right";
 #define BLOCK(stem)                                                                                                    \
     EXPECT_EQ(DtSet##stem##Fcn(&table, "block", plain, functionAt<stem##Fcn>(8)), nullptr);                            \
