@@ -57,7 +57,7 @@ const std::pair<const char*, Texts> rows[] = {
 TEST(TextMemory, ATextIsWrittenOrRead) {
     for (const auto& [name, text] : rows) {
         SCOPED_TRACE(name);
-        const auto twice = [&](Unused& u) {
+        const auto twice = [&text = text](Unused& u) {
             const std::string first = text(u);
             const std::string second = text(u);
             EXPECT_EQ(first, second);

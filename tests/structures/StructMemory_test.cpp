@@ -156,7 +156,7 @@ TEST(StructMemory, AViewIsAsked) {
         for (int Unasked::*const which :
              {static_cast<int Unasked::*>(&Unasked::alias_), static_cast<int Unasked::*>(&Unasked::whole)}) {
             SCOPED_TRACE(name);
-            EXPECT_GT(failEach<Unasked>([&](Unasked& u) { question(u, u.*which); }), 0u);
+            EXPECT_GT(failEach<Unasked>([&question = question, which](Unasked& u) { question(u, u.*which); }), 0u);
             if (HasFailure()) return;
         }
 }
