@@ -106,20 +106,19 @@ TEST(OverflowPrediction, SinglesInto32BitsFollowTheRoundedBounds) {
     });
 }
 
+template <class S, class D> void integersOverflowOutsideTheRange(const Level& level) {
+    if constexpr (isInteger<S> && isInteger<D>) {
+        constexpr bool examined = overflowMatters<S, D>;
+        for (const S v : specialValues<S>())
+            ASSERT_EQ(expected(std::vector<S>{v}, idOf<D>, FXP_ROUND_ZERO), examined && !std::in_range<D>(v))
+                << level.name << ": " << typeNames[idOf<S>] << " to " << typeNames[idOf<D>] << " of "
+                << std::int64_t{v};
+    }
+}
+
 TEST(OverflowPrediction, IntegersOverflowOutsideTheRange) {
     onEachLevel([](const Level& level) {
-        forEachType([&]<class S> {
-            forEachType([&]<class D> {
-                if constexpr (isInteger<S> && isInteger<D>) {
-                    constexpr bool examined = overflowMatters<S, D>;
-                    for (const S v : specialValues<S>())
-                        ASSERT_EQ(expected(std::vector<S>{v}, idOf<D>, FXP_ROUND_ZERO),
-                                  examined && !std::in_range<D>(v))
-                            << level.name << ": " << typeNames[idOf<S>] << " to " << typeNames[idOf<D>] << " of "
-                            << std::int64_t{v};
-                }
-            });
-        });
+        forEachType([&]<class S> { forEachType([&]<class D> { integersOverflowOutsideTheRange<S, D>(level); }); });
     });
 }
 
