@@ -269,7 +269,9 @@ class Line {
         if (cells_.empty()) return;
         std::sort(cells_.begin(), cells_.end(), [](const Cell& a, const Cell& b) { return a.ratio < b.ratio; });
         const auto isBeyond = [&](const Cell& cell) { return cell.ratio > limit_; };
-        const auto isReading = [&](const Cell& cell) { return isBeyond(cell) && cell.timesReading < limit_; };
+        const auto isReading = [&](const Cell& cell) {
+            return isBeyond(cell) && cell.timesReading && *cell.timesReading <= limit_;
+        };
         const auto beyond = std::count_if(cells_.begin(), cells_.end(), isBeyond);
         std::printf("%-62s at most %4.2f: %s (%zu cells, median %.2f, worst %.2f", title_.c_str(), limit_,
                     beyond ? "NOT MET" : "met", cells_.size(), cells_[cells_.size() / 2].ratio, cells_.back().ratio);
